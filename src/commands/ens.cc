@@ -1,0 +1,89 @@
+// ENS control: the host-wide activation node, activation and deactivation on
+// a portset, and uplink reassociation with the optional device manager
+// signal.
+#include <signal.h>
+#include <sys/types.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <fstream>
+#include <iostream>
+#include <limits>
+
+#include "commands/commands.h"
+#include "hostctl/nodi.h"
+#include "hostctl/tarnctl.h"
+
+namespace Commands {
+namespace {
+
+constexpr const char kDeviceManagerPidFile[] = "/var/run/halden/tarndevmgr.pid";
+constexpr const char kPidMaxFile[] = "/proc/sys/kernel/pid_max";
+// Version argument of the node interface's signature check.
+constexpr int kNodiSigVersion = 21;
+
+// One above the largest process id of this system; when the kernel does not
+// say, every value that stays positive as a pid_t.
+uint64_t PidLimit() {
+  uint64_t limit = static_cast<uint64_t>(std::numeric_limits<pid_t>::max()) + 1;
+  std::ifstream in(kPidMaxFile);
+  uint64_t pidMax = 0;
+  if (in >> pidMax && pidMax > 0 && pidMax < limit) limit = pidMax;
+  return limit;
+}
+
+}  // namespace
+
+void ActivateEnsNode() {
+  NODI_SigResult result;
+  uint32_t info = 0;
+  const int status = NODI_CheckSig(&result, kNodiSigVersion, &info);
+  if (status != 0) {
+    std::cerr << "NODI_CheckSig failed: " << TARN_ReturnStatusToString(status) << std::endl;
+    std::exit(1);
+  }
+  NODI_ParamList* params = TarnCtl::Util::SysinfoUtil::GetIntParamList(1, NODI_PARAM_LIST_INT);
+  if (params == nullptr) {
+    std::cerr << "Error, failed to create NODI parameter list." << std::endl;
+    std::exit(1);
+  }
+  // Setting the node is best effort: its status is not examined.
+  NODI_Set(NODI_NODE_net_ens_activate, 0, params, 0, 0);
+  NODI_ParamListDestroy(params);
+}
+
+void ActivateEnsOnPortset(HostCtl::Network::Portset& portset, bool intr, bool fastSwitch) {
+  ActivateEnsNode();
+  portset.ActivateEns(intr, fastSwitch);
+}
+
+void DeactivateEnsOnPortset(HostCtl::Network::Portset& portset) {
+  portset.DeactivateEns();
+}
+
+void SignalDeviceManager() {
+  uint32_t pid = 0;
+  {
+    std::ifstream in(kDeviceManagerPidFile);
+    if (!in.is_open()) {
+      std::cout << "Failed to open " << kDeviceManagerPidFile << std::endl;
+      std::exit(1);
+    }
+    if (!(in >> pid)) pid = 0;
+  }
+  // 0 would signal our own process group; values at or above the limit name
+  // no single process (and may turn negative as a pid_t).
+  if (pid == 0 || pid >= PidLimit()) {
+    std::cout << "Failed to read device manager PID" << std::endl;
+    std::exit(1);
+  }
+  // Fire and forget: the daemon is not waited for.
+  kill(static_cast<pid_t>(pid), SIGHUP);
+}
+
+void ReassociateEns(HostCtl::Network::Portset& portset, bool force) {
+  const bool mode = portset.GetEnsMode();
+  portset.ReassociateEnsUplinks(mode, force, 0, 0);
+}
+
+}  // namespace Commands
