@@ -1,0 +1,284 @@
+// The option loop: bits, fields, conversions, getopt_long conventions and
+// every way the parse ends the process.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "cli/options.h"
+#include "hostctl/network.h"
+
+namespace {
+
+using Cli::CommandMask;
+using Cli::CommandOptions;
+using Args = std::vector<std::string>;
+
+constexpr const char kUuid[] = "00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ff";
+
+struct Parsed {
+  CommandOptions options;
+  int firstOperand = 0;
+  Args operands;
+};
+
+Parsed Parse(const Args& args) {
+  Args words{"orvocfg-vswitch"};
+  words.insert(words.end(), args.begin(), args.end());
+  std::vector<char*> argv;
+  for (std::string& word : words) argv.push_back(word.data());
+  argv.push_back(nullptr);
+  const int argc = static_cast<int>(words.size());
+  Parsed parsed;
+  parsed.options = Cli::ParseCommandLine(argc, argv.data(), parsed.firstOperand);
+  for (int i = parsed.firstOperand; i < argc; ++i) parsed.operands.push_back(argv[i]);
+  return parsed;
+}
+
+// For death tests: the usage text that follows an error is not wanted here.
+void ParseQuietly(const Args& args) {
+  if (std::freopen("/dev/null", "w", stdout) == nullptr) return;
+  Parse(args);
+}
+
+// The whole of standard error must be `line` and its newline.
+std::string WholeLine(const std::string& line) {
+  std::string regex = "^";
+  for (char c : line) {
+    if (std::string(".[]()*+?{}|^$\\").find(c) != std::string::npos) regex += '\\';
+    regex += c;
+  }
+  return regex + "\n$";
+}
+
+std::string Show(const Args& args) {
+  std::string text;
+  for (const std::string& arg : args) text += " '" + arg + "'";
+  return text;
+}
+
+TEST(CommandOptions, StartValues) {
+  const CommandOptions options;
+  EXPECT_EQ(options.mask, 0u);
+  EXPECT_EQ(options.numPorts, HostCtl::Network::Portset::DEF_NUM_PORTS);
+  EXPECT_EQ(options.cdpStatus, "print");
+}
+
+TEST(ParseCommandLine, EveryOptionSetsItsBitByLetterAndByName) {
+  const struct {
+    Args shortForm, longForm;
+    CommandMask mask;
+  } cases[] = {
+      {{"-a"}, {"--add"}, 0x1},
+      {{"-a", "-W"}, {"--add", "--dvswitch"}, 0x200001},
+      {{"-d", "-W"}, {"--delete", "--dvswitch"}, 0x200002},
+      {{"-a", "-W", "-u", kUuid}, {"--add", "--dvswitch", "--uuid", kUuid}, 0x600001},
+      {{"-a", "-W", "-I", "c"}, {"--add", "--dvswitch", "--impl-class=c"}, 0xa00001},
+      {{"-a", "-W", "-n", "6"}, {"--add", "--dvswitch", "--version=6"}, 0x1200001},
+      {{"-l", "-S"}, {"--list", "--system"}, 0x8000000004},
+      {{"-L", "p"}, {"--link=p"}, 0x8},
+      {{"-U", "p"}, {"--unlink", "p"}, 0x10},
+      {{"-R"}, {"--restore-uplinks"}, 0x100000},
+      {{"-r"}, {"--restore"}, 0x20},
+      {{"-Apg"}, {"--add-pg=pg"}, 0x40},
+      {{"-D", "pg"}, {"--del-pg=pg"}, 0x80},
+      {{"-C", "pg"}, {"--check-pg=pg"}, 0x200},
+      {{"-c"}, {"--check"}, 0x100},
+      {{"-p", "pg", "-V", "1"}, {"--pg=pg", "--dvp=1"}, 0},
+      {{"-v", "1"}, {"--vlan=1"}, 0x400},
+      {{"-B", "down"}, {"--set-cdp=down"}, 0x800},
+      {{"-b"}, {"--get-cdp"}, 0x800},
+      {{"-M", "u"}, {"--add-pg-uplink=u"}, 0x4000},
+      {{"-N", "u"}, {"--del-pg-uplink=u"}, 0x8000},
+      {{"-P", "u"}, {"--add-dvp-uplink=u"}, 0x10000},
+      {{"-Q", "u"}, {"--del-dvp-uplink=u"}, 0x20000},
+      {{"-m", "1500"}, {"--mtu=1500"}, 0x1000},
+      {{"-X", "2"}, {"--set-maxactive=2"}, 0x80000},
+      {{"-x"}, {"--get-maxactive"}, 0x40000},
+      {{"-T"}, {"--test-sync-nota"}, 0x2000},
+      {{"-y", "-i", "-F"}, {"--activate-ens", "--intr", "--fast-switch"}, 0xc2000000},
+      {{"-Y"}, {"--deactivate-ens"}, 0x4000000},
+      {{"-z"}, {"--reassociate-ens"}, 0x8000000},
+      {{"-Z"}, {"--ens-ready"}, 0x10000000},
+      {{"-f"}, {"--force-reassociate-ens"}, 0x20000000},
+      {{"-O"}, {"--load-lacp-timeout"}, 0x200000000},
+      {{"-o", "-s", "ps", "-j", "1", "-k", "u"},
+       {"--get-lacp-timeout", "--portset=ps", "--lagid=1", "--uplink=u"},
+       0x1d00000000},
+      {{"-g"}, {"--get-lag-timeout"}, 0x2000000000},
+      {{"-G"}, {"--load-lag-timeout"}, 0x4000000000},
+      // The ENS options are not commands: they may follow one.
+      {{"-a", "-y", "-Y", "-z", "-f"},
+       {"--add", "--activate-ens", "--deactivate-ens", "--reassociate-ens",
+        "--force-reassociate-ens"},
+       0x2e000001},
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(Parse(c.shortForm).options.mask, c.mask) << Show(c.shortForm);
+    EXPECT_EQ(Parse(c.longForm).options.mask, c.mask) << Show(c.longForm);
+  }
+}
+
+TEST(ParseCommandLine, StoresStringArgumentsLastOneWins) {
+  const struct {
+    Args args;
+    std::string CommandOptions::*field;
+    const char* value;
+  } cases[] = {
+      {{"-Lpnic1"}, &CommandOptions::uplinkName, "pnic1"},
+      {{"-P", "u1", "-V", "7"}, &CommandOptions::uplinkName, "u1"},
+      {{"-P", "u1", "-V", "7"}, &CommandOptions::dvPortId, "7"},
+      {{"-A", "b", "-p", "a"}, &CommandOptions::portGroupName, "a"},
+      {{"-p", "a", "-A", "b"}, &CommandOptions::portGroupName, "b"},
+      {{"-M", "u", "-p", "a", "--pg", "c"}, &CommandOptions::portGroupName, "c"},
+      {{"-B", "down"}, &CommandOptions::cdpStatus, "down"},
+      {{"-b"}, &CommandOptions::cdpStatus, "print"},
+      {{"-a", "-W", "--uuid", kUuid}, &CommandOptions::uuidText, kUuid},
+      {{"-a", "-W", "--impl", "cls"}, &CommandOptions::implClass, "cls"},
+      {{"-a", "-W", "--vers", "6.5"}, &CommandOptions::dvsVersion, "6.5"},
+      {{"-o", "--portset=ps"}, &CommandOptions::portsetName, "ps"},
+      {{"-o", "--uplink=u"}, &CommandOptions::timeoutUplinkName, "u"},
+  };
+  for (const auto& c : cases) EXPECT_EQ(Parse(c.args).options.*c.field, c.value) << Show(c.args);
+}
+
+int64_t Vlan(const CommandOptions& o) {
+  return o.vlanId;
+}
+int64_t MaxActive(const CommandOptions& o) {
+  return o.maxActive;
+}
+int64_t Mtu(const CommandOptions& o) {
+  return o.mtu;
+}
+int64_t LagId(const CommandOptions& o) {
+  return o.lagId;
+}
+
+TEST(ParseCommandLine, ConvertsNumbersInAutomaticBase) {
+  const struct {
+    Args args;
+    int64_t (*field)(const CommandOptions&);
+    int64_t value;
+  } cases[] = {
+      {{"-v", "4095"}, Vlan, 4095},     {{"-v", "0xfff"}, Vlan, 4095},
+      {{"-v", "010"}, Vlan, 8},         {{"-v", ""}, Vlan, 0},
+      {{"-v", " 7"}, Vlan, 7},          {{"-v", "4294967296"}, Vlan, 0},
+      {{"-X", "3"}, MaxActive, 3},      {{"-X", "-2"}, MaxActive, -2},
+      {{"-X", "0x10"}, MaxActive, 16},  {{"-X", ""}, MaxActive, 0},
+      {{"-m", "70000"}, Mtu, 4464},     {{"-m", "abc"}, Mtu, 0},
+      {{"-m", "9000x"}, Mtu, 9000},     {{"-o", "--lagid=0x20"}, LagId, 32},
+      {{"-o", "-j", "7abc"}, LagId, 7},
+  };
+  for (const auto& c : cases) EXPECT_EQ(c.field(Parse(c.args).options), c.value) << Show(c.args);
+}
+
+TEST(ParseCommandLine, LeavesOperandsBehindTheOptions) {
+  const struct {
+    Args args;
+    CommandMask mask;
+    int firstOperand;
+    Args operands;
+  } cases[] = {
+      {{}, 0, 1, {}},
+      {{"-L", "p", "vs0", "x"}, 0x8, 3, {"vs0", "x"}},
+      {{"vs0", "-a"}, 0x1, 2, {"vs0"}},
+      {{"-a", "--", "-d"}, 0x1, 3, {"-d"}},
+      {{"-ay", "vs1"}, 0x2000001, 2, {"vs1"}},
+      {{"--add", "vs1"}, 0x1, 2, {"vs1"}},
+  };
+  for (const auto& c : cases) {
+    const Parsed parsed = Parse(c.args);
+    EXPECT_EQ(parsed.options.mask, c.mask) << Show(c.args);
+    EXPECT_EQ(parsed.firstOperand, c.firstOperand) << Show(c.args);
+    EXPECT_EQ(parsed.operands, c.operands) << Show(c.args);
+  }
+}
+
+struct Failure {
+  Args args;
+  int status;
+  std::string stderrRegex;
+};
+
+void ExpectFailures(const std::vector<Failure>& failures) {
+  for (const Failure& f : failures)
+    EXPECT_EXIT(ParseQuietly(f.args), ::testing::ExitedWithCode(f.status), f.stderrRegex)
+        << Show(f.args);
+}
+
+TEST(ParseCommandLineDeathTest, SecondCommandIsRefused) {
+  const std::string message = WholeLine("Error, only one command can be performed at a time.");
+  ExpectFailures({
+      {{"-a", "-a", "vs1"}, 1, message},
+      {{"-l", "-c"}, 1, message},
+      {{"-B", "down", "-b"}, 1, message},
+      {{"-y", "-a"}, 1, message},
+      {{"-a", "-m", "1500"}, 1, message},
+      {{"-R", "-y", "-R"}, 1, message},
+      {{"--portset=ps", "--get-lacp-timeout"}, 1, message},
+  });
+}
+
+TEST(ParseCommandLineDeathTest, CompanionMustComeFirst) {
+  const char* const dvswitch[] = {"uuid", "impl-class", "version"};
+  std::vector<Failure> failures = {
+      {{"--dvswitch"},
+       1,
+       WholeLine("Error, add or delete must be specified in order to use dvswitch")},
+      {{"-l", "-i"}, 1, WholeLine("Error, activate-ens must be specified in order to use intr")},
+      {{"-F", "-y"},
+       1,
+       WholeLine("Error, activate-ens must be specified in order to use fast-switch")},
+      {{"-S", "-l"}, 1, WholeLine("Error, list must be specified in order to use system")},
+  };
+  // "add" is checked before "dvswitch", and delete does not stand for add.
+  for (const char* name : dvswitch) {
+    const std::string option = std::string("--") + name + "=" + kUuid;
+    const std::string needsAdd =
+        WholeLine(std::string("Error, add must be specified in order to use ") + name);
+    failures.push_back({{option}, 1, needsAdd});
+    failures.push_back({{"-d", "-W", option}, 1, needsAdd});
+    failures.push_back(
+        {{"-a", option, "-W"},
+         1,
+         WholeLine(std::string("Error, dvswitch must be specified in order to use ") + name)});
+  }
+  ExpectFailures(failures);
+}
+
+TEST(ParseCommandLineDeathTest, BadArgumentsEndWithoutUsage) {
+  const std::string vlan = "Invalid vlan id.  Vlan must be between 0-4095: ";
+  const std::string uuid = ". Should be of format 61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00";
+  ExpectFailures({
+      {{"-v", "4096"}, 1, WholeLine(vlan + "4096")},
+      {{"-v", "12abc"}, 1, WholeLine(vlan + "12abc")},
+      {{"--vlan=-1"}, 1, WholeLine(vlan + "-1")},
+      {{"-v", "7 "}, 1, WholeLine(vlan + "7 ")},
+      {{"-X", "2x"}, 1, WholeLine("Invalid max active:2x")},
+      {{"-a", "-W", "-u", "xyz"}, 1, WholeLine("Invalid UUID:xyz" + uuid)},
+      {{"-a", "-W", "-u", "0123456789abcdef"},
+       1,
+       WholeLine("Invalid UUID:0123456789abcdef" + uuid)},
+  });
+}
+
+TEST(ParseCommandLineDeathTest, UsageEndsTheParse) {
+  ExpectFailures({
+      {{"-h"}, 0, "^$"},
+      {{"-a", "-h", "-a"}, 0, "^$"},
+      {{"--he"}, 0, "^$"},
+      {{"-a", "-a", "-h"}, 1, "only one command"},
+      {{"-t"}, 1, "^$"},
+      {{"--get-uplink-timeout"},
+       1,
+       "^orvocfg-vswitch: unrecognized option '--get-uplink-timeout'\n$"},
+      {{"-q"}, 1, "invalid option -- 'q'\n$"},
+      {{"-L"}, 1, "option requires an argument -- 'L'\n$"},
+      {{"--link"}, 1, "option '--link' requires an argument\n$"},
+      {{"--ad"}, 1, "ambiguous"},
+  });
+}
+
+}  // namespace

@@ -1,0 +1,72 @@
+// The text helpers: list joining and the UUID text form.
+#include <gtest/gtest.h>
+
+#include <string>
+#include <vector>
+
+#include "listing/text.h"
+
+namespace {
+
+using HostCtl::Misc::IsValidUuidString;
+using HostCtl::Misc::UuidToString;
+using HostCtl::Misc::VectorToString;
+
+TEST(VectorToString, JoinsWithoutTrailingSeparator) {
+  using Names = std::vector<std::string>;
+  EXPECT_EQ(VectorToString(Names{}, ","), "");
+  EXPECT_EQ(VectorToString(Names{"pnic0"}, ","), "pnic0");
+  EXPECT_EQ(VectorToString(Names{"pnic0", "pnic1", "pnic2"}, ","), "pnic0,pnic1,pnic2");
+  EXPECT_EQ(VectorToString(Names{"a", "b"}, ", "), "a, b");
+  EXPECT_EQ(VectorToString(Names{"a", "b"}, nullptr), "a");
+}
+
+TEST(UuidToString, KeepsFifteenBytesAndZeroPads) {
+  const struct {
+    std::string text;
+    const char* uuid;
+  } cases[] = {
+      {"abcdefghijklmnop", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00"},
+      {"abcdefghijklmno", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00"},
+      {"abcdefghijklmn", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 00 00"},
+      {"vswitch0", "76 73 77 69 74 63 68 30-00 00 00 00 00 00 00 00"},
+      {"", "00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 00"},
+      {"\xff\x80z", "ff 80 7a 00 00 00 00 00-00 00 00 00 00 00 00 00"},
+  };
+  for (const auto& c : cases) EXPECT_STREQ(UuidToString(c.text.c_str()), c.uuid) << c.text;
+}
+
+TEST(UuidToString, SharesOneBuffer) {
+  const char* first = UuidToString("a");
+  EXPECT_EQ(UuidToString("b"), first);
+  EXPECT_STREQ(first, "62 00 00 00 00 00 00 00-00 00 00 00 00 00 00 00");
+}
+
+TEST(IsValidUuidString, FollowsScanRules) {
+  const struct {
+    const char* text;
+    bool valid;
+  } cases[] = {
+      {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ff", true},
+      {"0011223344556677-8899aabbccddeeff", true},
+      {"AA BB CC DD EE FF 00 11-22 33 44 55 66 77 88 99", true},
+      {"0 1 2 3 4 5 6 7-8 9 a b c d e f", true},
+      {"00 11 22 33 44 55 66 77- 88 99 aa bb cc dd ee ff", true},
+      {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ffXYZ", true},
+      {"  00\t11\n22 33 44 55 66 77-88 99 aa bb cc dd ee ff", true},
+      {"0123456789abcdef", false},
+      {"00 11 22 33 44 55 66 77 -88 99 aa bb cc dd ee ff", false},
+      {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee", false},
+      {"00:11:22:33:44:55:66:77-88:99:aa:bb:cc:dd:ee:ff", false},
+      {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee gg", false},
+      {"", false},
+  };
+  for (const auto& c : cases) EXPECT_EQ(IsValidUuidString(c.text), c.valid) << '"' << c.text << '"';
+}
+
+TEST(IsValidUuidString, AcceptsWhatUuidToStringWrites) {
+  for (const char* text : {"", "vswitch0", "abcdefghijklmnopqrstuvwxyz", "\x01\x7f\x80\xfe\xff"})
+    EXPECT_TRUE(IsValidUuidString(UuidToString(text))) << text;
+}
+
+}  // namespace
