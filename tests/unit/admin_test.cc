@@ -1,0 +1,294 @@
+// The administration of the simulated host: seeding refusals, and the dump
+// that must reproduce a host exactly and refuse any faulty document
+// without touching the host.
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <functional>
+#include <string>
+
+#include "hostctl/exception.h"
+#include "tarnctl/admin.h"
+
+namespace {
+
+using HostCtl::Lib::HostCtlException;
+using TarnCtl::Admin::DVPortSeed;
+using TarnCtl::Admin::DVSwitchSeed;
+using TarnCtl::Admin::FaultSeed;
+using TarnCtl::Admin::Host;
+using TarnCtl::Admin::OpaqueSeed;
+
+// Each test gets a host database of its own.
+class AdminTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    char dir[] = "/tmp/admin_test.XXXXXX";
+    ASSERT_NE(mkdtemp(dir), nullptr);
+    dir_ = dir;
+    UseDatabase("host.db");
+    unsetenv("TARN_TRACE");
+  }
+  void TearDown() override { std::filesystem::remove_all(dir_); }
+
+  void UseDatabase(const std::string& name) {
+    setenv("TARN_HOST_DB", (dir_ + "/" + name).c_str(), 1);
+  }
+
+  // A host with something in every table the administration can fill.
+  static void Seed(Host& host) {
+    host.AddPnic("pnic4");
+    host.AddPnic("pnic5");
+    host.AddPnic("nic\xff\"q\"\n");  // names are bytes, not necessarily text
+    host.AddClient("Management", "vm1");
+    host.AddClient("Management", "vm2");
+    host.AddSystemSwitch("sys0", 64);
+    host.AddDVSwitch({"dvs0", "ps0", std::nullopt, 256, 9000, {"pnic1", "pnic2"}});
+    host.AddDVPort({"dvs0", "100", {"vmA", "vmB"}, 42});
+    host.AddDVPort({"dvs0", "101", {}, 0});
+    host.AddOpaqueSwitch({"opq0", std::nullopt, 32, 5, {"pnic3"}});
+    host.AddUplinkTimeout("vswitch0", "pnic0", 7, 255);
+    host.AddLagTimeout("dvs0", 3, 0);
+    host.AddFault({"SetVlanId", "pg2", "boom", "boom in detail", 1, 2});
+    host.AddFault({"GetName", std::nullopt, std::nullopt, std::nullopt, 0, 1});
+  }
+
+  std::string dir_;
+};
+
+TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
+  std::string dumped, shown;
+  {
+    Host host;
+    Seed(host);
+    dumped = host.Dump();
+    shown = host.Show();
+  }
+  ASSERT_EQ(dumped.back(), '\n');
+  for (const char* part : {"\"format\": \"tarnhost-dump\"", "\"version\": 1", "\"hex\":",
+                           "\"uplinkOrder\": [\n", "\"target\": null", "\"name\": \"sys0\""}) {
+    EXPECT_NE(dumped.find(part), std::string::npos) << part;
+  }
+  // Into an emptied host, and into a brand-new file.
+  for (const char* db : {"host.db", "other.db"}) {
+    UseDatabase(db);
+    Host host;
+    host.Init(true);
+    host.Load(dumped);
+    EXPECT_EQ(host.Dump(), dumped) << db;
+    EXPECT_EQ(host.Show(), shown) << db;
+  }
+}
+
+TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
+  const std::string tooLong(32, 'x');
+  const struct {
+    const char* what;
+    std::function<void(Host&)> call;
+    const char* message;
+  } cases[] = {
+      {"pnic twice", [](Host& h) { h.AddPnic("pnic0"); }, "Pnic pnic0 already exists"},
+      {"pnic empty", [](Host& h) { h.AddPnic(""); }, "Pnic name is empty"},
+      {"pnic long", [&](Host& h) { h.AddPnic(tooLong); }, "is too long"},
+      {"client unknown pg", [](Host& h) { h.AddClient("nosuch", "vm"); },
+       "Portgroup nosuch does not exist"},
+      {"client twice", [](Host& h) { h.AddClient("Management", "vm1"); },
+       "Client vm1 is already on portgroup Management"},
+      {"client unnamed", [](Host& h) { h.AddClient("Management", ""); }, "Client name is empty"},
+      {"system switch name taken", [](Host& h) { h.AddSystemSwitch("vswitch0", 64); },
+       "vswitch0 already exists"},
+      {"system switch name taken by a portset", [](Host& h) { h.AddSystemSwitch("ps0", 64); },
+       "ps0 already exists"},
+      {"system switch ports low", [](Host& h) { h.AddSystemSwitch("s", 7); },
+       "Invalid number of ports 7"},
+      {"system switch ports high", [](Host& h) { h.AddSystemSwitch("s", 4097); },
+       "Invalid number of ports 4097"},
+      {"system switch long name", [&](Host& h) { h.AddSystemSwitch(tooLong, 64); }, "is too long"},
+      {"dvs pnic taken by vswitch",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic0"}});
+       },
+       "pnic0 is already linked to vswitch0"},
+      {"dvs pnic taken by dvs",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic1"}});
+       },
+       "pnic1 is already linked to dvs0"},
+      {"dvs pnic taken by opaque",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic3"}});
+       },
+       "pnic3 is already linked to opq0"},
+      {"dvs unknown pnic",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic9"}});
+       },
+       "Uplink pnic9 does not exist"},
+      {"dvs pnic twice",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}});
+       },
+       "Uplink pnic4 is given twice"},
+      {"dvs mtu",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, {}, 128, 9001, {}});
+       },
+       "Invalid MTU 9001"},
+      {"dvs id taken",
+       [](Host& h) {
+         h.AddDVSwitch({"d", {}, "dvs-dvs0", 128, 1500, {}});
+       },
+       "Switch id dvs-dvs0 is already in use"},
+      {"dvs name taken",
+       [](Host& h) {
+         h.AddDVSwitch({"dvs0", "p9", {}, 128, 1500, {}});
+       },
+       "dvs0 already exists"},
+      {"dvport unknown dvs",
+       [](Host& h) {
+         h.AddDVPort({"nosuch", "1", {}, 0});
+       },
+       "Distributed switch nosuch does not exist"},
+      {"dvport twice",
+       [](Host& h) {
+         h.AddDVPort({"dvs0", "100", {}, 0});
+       },
+       "DVPort 100 already exists on dvs0"},
+      {"dvport client twice",
+       [](Host& h) {
+         h.AddDVPort({"dvs0", "7", {"a", "a"}, 0});
+       },
+       "Client a is given twice"},
+      {"opaque used beyond ports",
+       [](Host& h) {
+         h.AddOpaqueSwitch({"o", {}, 16, 17, {}});
+       },
+       "used ports 17"},
+      {"uplink timeout high", [](Host& h) { h.AddUplinkTimeout("vs0", "u", 1, 256); },
+       "Invalid timeout 256"},
+      {"uplink timeout twice", [](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
+       "already stored"},
+      {"lag timeout twice", [](Host& h) { h.AddLagTimeout("dvs0", 3, 1); }, "already stored"},
+      {"lag timeout unnamed portset", [](Host& h) { h.AddLagTimeout("", 3, 1); },
+       "Portset name is empty"},
+      {"fault without operation",
+       [](Host& h) {
+         h.AddFault({"", {}, {}, {}, 0, 1});
+       },
+       "Fault operation is empty"},
+      {"fault never failing",
+       [](Host& h) {
+         h.AddFault({"GetName", {}, {}, {}, 0, 0});
+       },
+       "Invalid times 0"},
+      {"fault negative skip",
+       [](Host& h) {
+         h.AddFault({"GetName", {}, {}, {}, -1, 1});
+       },
+       "Invalid skip count -1"},
+  };
+  Host host;
+  Seed(host);
+  const std::string before = host.Dump();
+  for (const auto& c : cases) {
+    try {
+      c.call(host);
+      ADD_FAILURE() << c.what << ": not refused";
+    } catch (const HostCtlException& e) {
+      EXPECT_NE(e.GetMessage().find(c.message), std::string::npos)
+          << c.what << ": " << e.GetMessage();
+      EXPECT_EQ(e.GetDetailedMessage().rfind("Add", 0), 0u) << c.what;
+    }
+    EXPECT_EQ(host.Dump(), before) << c.what;
+  }
+}
+
+TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {
+  Host host;
+  host.AddDVSwitch({"dvs0", {}, {}, 128, 1500, {}});
+  host.AddDVSwitch({"x", "dvs-dvs0", {}, 128, 1500, {}});
+  host.AddSystemSwitch("sys0", 64);
+  const std::string dump = host.Dump();
+  // Ids derived from the name stay unique; the UUID text is the name's bytes.
+  EXPECT_NE(dump.find("\"switch_id\": \"dvs-dvs0\""), std::string::npos);
+  EXPECT_NE(dump.find("\"switch_id\": \"dvs-x\""), std::string::npos);
+  EXPECT_NE(dump.find("\"uuid\": \"64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00\""),
+            std::string::npos);
+  // Both layers hold the system switch, with an explicit empty order.
+  size_t at = 0;
+  int copies = 0;
+  while ((at = dump.find("\"name\": \"sys0\"", at)) != std::string::npos) ++copies, ++at;
+  EXPECT_EQ(copies, 2);
+  EXPECT_NE(dump.find("\"system\": 1"), std::string::npos);
+}
+
+TEST_F(AdminTest, LoadRefusesFaultyDumpsAndKeepsTheHost) {
+  Host host;
+  Seed(host);
+  const std::string good = host.Dump();
+  auto replaced = [&](const std::string& from, const std::string& to) {
+    auto at = good.find(from);
+    EXPECT_NE(at, std::string::npos) << from;
+    std::string text = good;
+    return at == std::string::npos ? text : text.replace(at, from.size(), to);
+  };
+  auto counterAt = [&](const std::string& value) {
+    const std::string key = "\"key\": \"next_seq\",\n        \"value\": \"";
+    const auto at = good.find(key) + key.size();
+    std::string text = good;
+    return text.replace(at, good.find('"', at) - at, value);
+  };
+  const struct {
+    const char* what;
+    std::string text;
+    const char* message;
+  } cases[] = {
+      {"not JSON", "{\"format\": ", "not valid JSON"},
+      {"trailing text", good + "x", "not valid JSON"},
+      {"array", "[]", "a dump is a JSON object"},
+      {"version unknown", replaced("\"version\": 1", "\"version\": 2"), "unsupported version 2"},
+      {"version as text", replaced("\"version\": 1", "\"version\": \"1\""), "must be an integer"},
+      {"version missing", replaced("\"version\": 1,", ""), "\"version\" must come before"},
+      {"format wrong", replaced("tarnhost-dump", "other"), "\"format\" must be"},
+      {"unknown top key", replaced("\"version\": 1,", "\"version\": 1, \"extra\": 0,"),
+       "unknown key \"extra\""},
+      {"table unknown", replaced("\"fault\": [", "\"faults\": ["), "unknown table \"faults\""},
+      {"table missing", replaced("\"ens\": [],", ""), "table \"ens\" is missing"},
+      {"table not an array", replaced("\"ens\": []", "\"ens\": {}"), "must be an array"},
+      {"field missing", replaced("\"vlan\": 0,", ""), "field \"vlan\" is missing"},
+      {"field unknown", replaced("\"vlan\": 0,", "\"vlan\": 0, \"colour\": 1,"),
+       "unknown field \"colour\""},
+      {"wrong type", replaced("\"vlan\": 0", "\"vlan\": \"0\""), "must be an integer"},
+      {"out of range", replaced("\"vlan\": 0", "\"vlan\": 4096"), "must be 0 to 4095"},
+      {"negative", replaced("\"mtu\": 1500", "\"mtu\": -1500"), "must be 1280 to 9000"},
+      {"policy incomplete", replaced("\"maxActive\": 1", "\"maxactive\": 1"),
+       "lacks \"maxActive\""},
+      {"duplicate row", replaced("\"name\": \"pnic5\"", "\"name\": \"pnic4\""),
+       "repeats the key of an earlier row"},
+      {"dangling port group",
+       replaced("\"switch\": \"vswitch0\",\n        \"seq\": 7",
+                "\"switch\": \"gone\",\n        \"seq\": 7"),
+       "belongs to switch gone"},
+      {"dangling client", replaced("\"portgroup\": \"Management\"", "\"portgroup\": \"gone\""),
+       "client vm1 is on port group gone"},
+      {"dangling uplink",
+       replaced("\"uplinks\": [\n          \"pnic3\"", "\"uplinks\": [\n \"pnicX\""),
+       "uplink pnicX of opaque switch opq0 is not a pnic"},
+      {"counter behind", counterAt("3"), "is not beyond the largest seq"},
+      {"counter not a number", counterAt("x"), "\"next_seq\" is not a number"},
+  };
+  for (const auto& c : cases) {
+    try {
+      host.Load(c.text);
+      ADD_FAILURE() << c.what << ": accepted";
+    } catch (const HostCtlException& e) {
+      EXPECT_NE(e.GetMessage().find(c.message), std::string::npos)
+          << c.what << ": " << e.GetMessage();
+    }
+    EXPECT_EQ(host.Dump(), good) << c.what;
+  }
+}
+
+}  // namespace
