@@ -80,6 +80,10 @@ class Session {
   // The next value of the ordering counter (meta 'next_seq'); call inside
   // a transaction.
   int64_t NextSeq();
+  // Rows inserted, changed or deleted through this session so far, in any
+  // table. Lets the library keep copies of rows (and of the fault table)
+  // and notice that they may be stale.
+  int64_t ChangeCount() const;
 
  private:
   Session(std::string path, sqlite3* db, int lockFd);

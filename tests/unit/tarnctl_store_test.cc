@@ -1,0 +1,180 @@
+// The host database file: creation, refusal of files that are not host
+// databases, persistence between sessions, and the host's lock.
+#include <sqlite3.h>
+
+#include <chrono>
+#include <thread>
+
+#include "host_fixture.h"
+#include "tarnctl/admin.h"
+#include "tarnctl/schema.h"
+#include "tarnctl/session.h"
+
+namespace {
+
+using TarnCtl::Detail::Session;
+using TarnCtl::Detail::Transaction;
+
+using StoreTest = HostTest;
+
+int64_t CountRows(Session& session, const char* sql) {
+  auto select = session.Prepare(sql);
+  EXPECT_TRUE(select.Step());
+  return select.Int(0);
+}
+
+// Makes a SQLite file at `path` by running `sql` with the sqlite3 API.
+void MakeSqliteFile(const std::string& path, const std::string& sql) {
+  sqlite3* db = nullptr;
+  ASSERT_EQ(sqlite3_open(path.c_str(), &db), SQLITE_OK);
+  ASSERT_EQ(sqlite3_exec(db, sql.c_str(), nullptr, nullptr, nullptr), SQLITE_OK);
+  sqlite3_close(db);
+}
+
+TEST_F(StoreTest, MissingFileIsCreatedWithTheDefaultHost) {
+  auto session = Session::Acquire();
+  EXPECT_EQ(session->path(), path_);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic"), 4);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM vswitch WHERE name = 'vswitch0'"), 2);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM link WHERE pnic = 'pnic0'"), 2);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM portgroup WHERE name = 'Management'"), 2);
+  EXPECT_FALSE(std::filesystem::exists(path_ + ".new"));
+  // One session per process: a second acquisition shares it.
+  EXPECT_EQ(Session::Acquire(), session);
+  EXPECT_EQ(Session::Current(), session);
+}
+
+TEST_F(StoreTest, CommittedChangesPersistAndRolledBackOnesDoNot) {
+  {
+    auto session = Session::Acquire();
+    Transaction kept(*session);
+    session->Prepare("INSERT INTO pnic(seq, name) VALUES (?, ?)")
+        .Bind(1, session->NextSeq())
+        .Bind(2, std::string("pnic7"))
+        .Run();
+    kept.Commit();
+    Transaction dropped(*session);
+    session->Exec("INSERT INTO pnic(seq, name) VALUES (100, 'pnic8')");
+  }
+  EXPECT_EQ(Session::Current(), nullptr);
+  auto session = Session::Acquire();
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic WHERE name = 'pnic7'"), 1);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic WHERE name = 'pnic8'"), 0);
+  // The counter moved on past the value it handed out.
+  EXPECT_EQ(CountRows(*session, "SELECT seq FROM pnic WHERE name = 'pnic7'") + 1,
+            session->NextSeq());
+}
+
+// Files that are not host databases are refused by name and left unchanged.
+TEST_F(StoreTest, HostileFilesAreRefusedUntouched) {
+  struct Case {
+    const char* name;
+    std::function<void(const std::string&)> make;
+    const char* cause;
+  };
+  const std::vector<Case> cases = {
+      {"foreign", [](const std::string& p) { MakeSqliteFile(p, "CREATE TABLE t(x);"); },
+       "not a host database"},
+      {"newer",
+       [](const std::string& p) {
+         MakeSqliteFile(
+             p, "PRAGMA application_id=" + std::to_string(TarnCtl::Detail::kApplicationId) +
+                    "; PRAGMA user_version=" + std::to_string(TarnCtl::Detail::kSchemaVersion + 1) +
+                    "; CREATE TABLE future(x);");
+       },
+       "is newer than this library's"},
+      {"garbage", [](const std::string& p) { WriteFile(p, std::string(4096, 'g')); },
+       "file is not a database"},
+      {"empty", [](const std::string& p) { WriteFile(p, ""); }, "not a host database"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    std::filesystem::remove(path_);
+    c.make(path_);
+    const std::string before = ReadFile(path_);
+    std::string message = Refusal([] { Session::Acquire(); });
+    EXPECT_NE(message.find(path_), std::string::npos) << message;
+    EXPECT_NE(message.find(c.cause), std::string::npos) << message;
+    EXPECT_EQ(ReadFile(path_), before);
+    EXPECT_FALSE(std::filesystem::exists(path_ + "-journal"));
+    // The administration tool is refused the same way.
+    message = Refusal([] { TarnCtl::Admin::Host host; });
+    EXPECT_NE(message.find(path_), std::string::npos) << message;
+    EXPECT_EQ(ReadFile(path_), before);
+  }
+}
+
+TEST_F(StoreTest, ADatabaseErrorNamesTheFileAndRollsBack) {
+  auto session = Session::Acquire();
+  const std::string message = Refusal([&] {
+    Transaction transaction(*session);
+    session->Exec("INSERT INTO pnic(seq, name) VALUES (50, 'pnic50')");
+    session->Exec("INSERT INTO pnic(seq, name) VALUES (51, 'pnic0')");  // name taken
+    transaction.Commit();
+  });
+  EXPECT_NE(message.find(path_), std::string::npos) << message;
+  EXPECT_NE(message.find("UNIQUE"), std::string::npos) << message;
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic WHERE name = 'pnic50'"), 0);
+}
+
+TEST_F(StoreTest, ASecondProcessWaitsForTheLockAndThenGivesUp) {
+  auto session = Session::Acquire();
+  setenv("TARN_LOCK_TIMEOUT", "1", 1);
+  const auto start = std::chrono::steady_clock::now();
+  const int busy = InChild([this] {
+    const std::string message = Refusal([] { Session::Acquire(); });
+    return message == "Host " + path_ + " is busy: another process holds its lock" ? 0 : 1;
+  });
+  EXPECT_EQ(busy, 0);
+  EXPECT_GE(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(900));
+
+  // With time enough, the child gets the host once the parent lets go.
+  setenv("TARN_LOCK_TIMEOUT", "20", 1);
+  const pid_t pid = fork();
+  if (pid == 0) {
+    int status = 1;
+    try {
+      auto child = Session::Acquire();
+      status = CountRows(*child, "SELECT count(*) FROM pnic WHERE name = 'late'") == 1 ? 0 : 2;
+    } catch (...) {
+      status = 3;
+    }
+    _exit(status);
+  }
+  std::this_thread::sleep_for(std::chrono::milliseconds(300));
+  {
+    Transaction transaction(*session);
+    session->Exec("INSERT INTO pnic(seq, name) VALUES (60, 'late')");
+    transaction.Commit();
+  }
+  session.reset();
+  int status = 0;
+  waitpid(pid, &status, 0);
+  ASSERT_TRUE(WIFEXITED(status));
+  EXPECT_EQ(WEXITSTATUS(status), 0);
+}
+
+TEST_F(StoreTest, InitAndRebootReplaceTheRightRows) {
+  TarnCtl::Admin::Host host;
+  auto session = Session::Current();
+  ASSERT_NE(session, nullptr);
+  session->Exec(
+      "INSERT INTO ens(portset, intr, fast_switch) VALUES ('vswitch0', 0, 0);"
+      "UPDATE meta SET value = '1' WHERE key = 'ens_node';");
+  host.Reboot();
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM vswitch WHERE layer = 1"), 0);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM vswitch WHERE layer = 0"), 1);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM link"), 1);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM ens"), 0);
+  EXPECT_EQ(CountRows(*session, "SELECT value FROM meta WHERE key = 'ens_node'"), 0);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic"), 4);
+
+  host.Init(true);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic"), 0);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM vswitch"), 0);
+  host.Init(false);
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM vswitch WHERE layer = 1"), 1);
+  EXPECT_EQ(session->NextSeq(), 8);
+}
+
+}  // namespace
