@@ -9,7 +9,9 @@ Args::Args(const std::vector<std::string>& words, const std::vector<OptionSpec>&
   bool optionsEnded = false;
   for (size_t i = 0; i < words.size(); ++i) {
     const std::string& word = words[i];
-    if (optionsEnded || word == "-" || word.empty() || word[0] != '-') {
+    // "-" (standard input) and negative numbers are arguments, not options.
+    const bool option = word.size() > 1 && word[0] == '-' && !(word[1] >= '0' && word[1] <= '9');
+    if (optionsEnded || !option) {
       positional_.push_back(word);
       continue;
     }

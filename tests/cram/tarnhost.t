@@ -1,0 +1,425 @@
+tarnhost: the administration tool of the simulated host.
+
+  $ . "$TESTDIR/setup.sh"
+  $ usage() { "$@" 2>err; echo "status $?"; head -1 err; tail -n +2 err | cmp - help; }
+  $ refused() { "$@" 2>err; echo "status $?"; cat err; }
+
+Help goes to standard output with status 0; it is the text bad usage shows.
+
+  $ tarnhost --help > help; echo "status $?"
+  status 0
+  $ tarnhost -h | cmp - help
+  $ cat help
+  usage: tarnhost COMMAND [ARGUMENTS]
+  Administers the simulated host kept in $TARN_HOST_DB (see docs/host.md).
+  
+    init [--empty]        reset: the default host, or a host with nothing at all
+    show                  the host in readable form: running state and stored configuration
+    dump                  the whole host as JSON on standard output
+    load FILE             replace the host with a dump (FILE - : standard input)
+    reboot                drop the running state, keep the stored configuration
+    pnic add NAME
+    client add PORTGROUP CLIENT
+    system-switch add NAME [--ports N]
+    dvs add NAME [--portset NAME] [--id ID] [--ports N] [--mtu N] [--uplinks A,B,...]
+    dvport add DVS PORTID [--client NAME]... [--connection-id N]
+    opaque add NAME [--portset NAME] [--ports N] [--used N] [--uplinks A,B,...]
+    timeout uplink PORTSET UPLINK LAGID TIMEOUT
+    timeout lag PORTSET LAGID TIMEOUT
+    fault add OPERATION [--on NAME] [--message TEXT] [--detail TEXT] [--skip K] [--times N]
+    fault clear
+    -h, --help            this text
+  
+  Numbers are decimal. Options take their value as --opt VALUE or --opt=VALUE;
+  "--" ends the options. Exit status: 0 success, 1 refused by the host, 2 bad usage.
+
+Bad usage: the reason and the usage text on standard error, status 2, and
+no host is even opened.
+
+  $ usage tarnhost
+  status 2
+  tarnhost: no command given
+  $ usage tarnhost bogus
+  status 2
+  tarnhost: unknown command: bogus
+  $ usage tarnhost pnic
+  status 2
+  tarnhost: missing subcommand after pnic
+  $ usage tarnhost pnic remove pnic9
+  status 2
+  tarnhost: unknown command: pnic remove
+  $ usage tarnhost pnic add
+  status 2
+  tarnhost: missing arguments
+  $ usage tarnhost pnic add a b
+  status 2
+  tarnhost: too many arguments
+  $ usage tarnhost show extra
+  status 2
+  tarnhost: too many arguments
+  $ usage tarnhost init --empty=yes
+  status 2
+  tarnhost: option --empty takes no value
+  $ usage tarnhost init --full
+  status 2
+  tarnhost: unknown option --full
+  $ usage tarnhost timeout uplink vs0 u1 1
+  status 2
+  tarnhost: missing arguments
+  $ usage tarnhost timeout lag vs0 1 -5
+  status 2
+  tarnhost: bad number for TIMEOUT: "-5"
+  $ usage tarnhost timeout lag vs0 0x10 5
+  status 2
+  tarnhost: bad number for LAGID: "0x10"
+  $ usage tarnhost timeout lag vs0 4294967296 5
+  status 2
+  tarnhost: number for LAGID out of range: 4294967296
+  $ usage tarnhost system-switch add s1 --ports 2147483648
+  status 2
+  tarnhost: number for --ports out of range: 2147483648
+  $ usage tarnhost system-switch add s1 --ports 64 --ports 64
+  status 2
+  tarnhost: option --ports given twice
+  $ usage tarnhost dvs add d1 --uplinks pnic1,,pnic2
+  status 2
+  tarnhost: empty name in --uplinks
+  $ usage tarnhost dvs add d1 --mtu
+  status 2
+  tarnhost: option --mtu needs a value
+  $ usage tarnhost fault add GetName --skip ' 1'
+  status 2
+  tarnhost: bad number for --skip: " 1"
+  $ usage tarnhost fault clear now
+  status 2
+  tarnhost: too many arguments
+  $ ls
+  err
+  help
+
+The default host, readable and as a dump.
+
+  $ tarnhost show
+  Physical NICs: pnic0, pnic1, pnic2, pnic3
+  
+  Running state
+    Standard switch vswitch0: 128 ports, MTU 1500, CDP listen
+      Uplinks: pnic0
+      Teaming: flags 0x10, order pnic0, max active 1, balancing 0, failback 0
+      Port group Management: VLAN 0, clients (none)
+        Teaming: flags 0x0, order (not set), max active 0, balancing 0, failback 0
+    Distributed switches: (none)
+    ENS: activation node not set; active on (none)
+    Uplink timeouts: (none)
+    LAG timeouts: (none)
+  
+  Stored configuration
+    Standard switch vswitch0: 128 ports, MTU 1500, CDP listen
+      Uplinks: pnic0
+      Teaming: flags 0x10, order pnic0, max active 1, balancing 0, failback 0
+      Port group Management: VLAN 0, clients (none)
+        Teaming: flags 0x0, order (not set), max active 0, balancing 0, failback 0
+    Uplink timeouts: (none)
+    LAG timeouts: (none)
+  
+  Distributed switch cache
+    Distributed switches: (none)
+  
+  Opaque switches
+    (none)
+  
+  DVPorts
+    (none)
+  
+  Events
+    (none)
+  
+  Faults
+    (none)
+  $ tarnhost dump
+  {
+    "format": "tarnhost-dump",
+    "version": 1,
+    "tables": {
+      "meta": [
+        {
+          "key": "ens_node",
+          "value": "0"
+        },
+        {
+          "key": "next_seq",
+          "value": "8"
+        }
+      ],
+      "pnic": [
+        {
+          "seq": 1,
+          "name": "pnic0"
+        },
+        {
+          "seq": 2,
+          "name": "pnic1"
+        },
+        {
+          "seq": 3,
+          "name": "pnic2"
+        },
+        {
+          "seq": 4,
+          "name": "pnic3"
+        }
+      ],
+      "vswitch": [
+        {
+          "layer": 0,
+          "name": "vswitch0",
+          "seq": 5,
+          "num_ports": 128,
+          "mtu": 1500,
+          "cdp": 1,
+          "system": 0,
+          "policy": {
+            "flags": 16,
+            "balancing": 0,
+            "failback": 0,
+            "linkCriteria": {
+              "checkMask": 0,
+              "minSpeed": 0,
+              "errorPercent": 0,
+              "fullDuplex": 0
+            },
+            "uplinkOrder": [
+              "pnic0"
+            ],
+            "maxActive": 1
+          }
+        },
+        {
+          "layer": 1,
+          "name": "vswitch0",
+          "seq": 5,
+          "num_ports": 128,
+          "mtu": 1500,
+          "cdp": 1,
+          "system": 0,
+          "policy": {
+            "flags": 16,
+            "balancing": 0,
+            "failback": 0,
+            "linkCriteria": {
+              "checkMask": 0,
+              "minSpeed": 0,
+              "errorPercent": 0,
+              "fullDuplex": 0
+            },
+            "uplinkOrder": [
+              "pnic0"
+            ],
+            "maxActive": 1
+          }
+        }
+      ],
+      "portgroup": [
+        {
+          "layer": 0,
+          "name": "Management",
+          "switch": "vswitch0",
+          "seq": 7,
+          "vlan": 0,
+          "policy": {
+            "flags": 0,
+            "balancing": 0,
+            "failback": 0,
+            "linkCriteria": {
+              "checkMask": 0,
+              "minSpeed": 0,
+              "errorPercent": 0,
+              "fullDuplex": 0
+            },
+            "uplinkOrder": [],
+            "maxActive": 0
+          }
+        },
+        {
+          "layer": 1,
+          "name": "Management",
+          "switch": "vswitch0",
+          "seq": 7,
+          "vlan": 0,
+          "policy": {
+            "flags": 0,
+            "balancing": 0,
+            "failback": 0,
+            "linkCriteria": {
+              "checkMask": 0,
+              "minSpeed": 0,
+              "errorPercent": 0,
+              "fullDuplex": 0
+            },
+            "uplinkOrder": [],
+            "maxActive": 0
+          }
+        }
+      ],
+      "link": [
+        {
+          "layer": 0,
+          "pnic": "pnic0",
+          "switch": "vswitch0",
+          "seq": 6
+        },
+        {
+          "layer": 1,
+          "pnic": "pnic0",
+          "switch": "vswitch0",
+          "seq": 6
+        }
+      ],
+      "client": [],
+      "dvswitch": [],
+      "dvs_uplink": [],
+      "dvport": [],
+      "dvport_client": [],
+      "dvport_event": [],
+      "opaque": [],
+      "ens": [],
+      "ens_event": [],
+      "uplink_timeout": [],
+      "lag_timeout": [],
+      "fault": []
+    }
+  }
+
+Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
+
+  $ tarnhost dump > before.json
+  $ refused tarnhost pnic add pnic0
+  status 1
+  tarnhost: Pnic pnic0 already exists
+  $ refused tarnhost client add nosuch vm1
+  status 1
+  tarnhost: Portgroup nosuch does not exist
+  $ refused tarnhost system-switch add vswitch0
+  status 1
+  tarnhost: Switch or portset vswitch0 already exists
+  $ refused tarnhost system-switch add s1 --ports 4097
+  status 1
+  tarnhost: Invalid number of ports 4097: must be 8 to 4096
+  $ refused tarnhost dvs add d1 --uplinks pnic0
+  status 1
+  tarnhost: pnic0 is already linked to vswitch0
+  $ refused tarnhost dvs add d1 --uplinks pnic9
+  status 1
+  tarnhost: Uplink pnic9 does not exist
+  $ refused tarnhost dvs add d1 --mtu 1279
+  status 1
+  tarnhost: Invalid MTU 1279: must be 1280 to 9000
+  $ refused tarnhost dvs add 0123456789012345678901234567890123
+  status 1
+  tarnhost: Switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
+  $ refused tarnhost dvport add nosuch 10
+  status 1
+  tarnhost: Distributed switch nosuch does not exist
+  $ refused tarnhost opaque add o1 --ports 16 --used 17
+  status 1
+  tarnhost: Invalid number of used ports 17: must be 0 to 16
+  $ refused tarnhost timeout uplink vs0 u1 1 256
+  status 1
+  tarnhost: Invalid timeout 256: must be 0 to 255
+  $ refused tarnhost fault add GetName --times 0
+  status 1
+  tarnhost: Invalid times 0: must be >= 1
+  $ refused tarnhost fault add ''
+  status 1
+  tarnhost: Fault operation is empty
+  $ tarnhost dump | cmp - before.json
+
+Seeding shows up in both views, and a dump brings it all back.
+
+  $ tarnhost pnic add pnic4
+  $ tarnhost client add Management vm1
+  $ tarnhost system-switch add sys0 --ports=64
+  $ tarnhost dvs add dvs0 --portset ps0 --uplinks pnic1,pnic2
+  $ tarnhost dvport add dvs0 10 --client vmA --client vmB --connection-id 7
+  $ tarnhost opaque add opq0 --used 3 --uplinks pnic3
+  $ tarnhost timeout uplink vswitch0 pnic0 1 5
+  $ tarnhost timeout lag ps0 2 255
+  $ tarnhost fault add SetVlanId --on pg2 --skip 1 --message boom
+  $ tarnhost fault add -- -odd
+  $ tarnhost show
+  Physical NICs: pnic0, pnic1, pnic2, pnic3, pnic4
+  
+  Running state
+    Standard switch vswitch0: 128 ports, MTU 1500, CDP listen
+      Uplinks: pnic0
+      Teaming: flags 0x10, order pnic0, max active 1, balancing 0, failback 0
+      Port group Management: VLAN 0, clients vm1
+        Teaming: flags 0x0, order (not set), max active 0, balancing 0, failback 0
+    Standard switch sys0 (system): 64 ports, MTU 1500, CDP listen
+      Uplinks: (none)
+      Teaming: flags 0x10, order (none), max active 0, balancing 0, failback 0
+    Distributed switch dvs0: portset ps0, id dvs-dvs0, 128 ports, MTU 1500
+      UUID 64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00, class cswitch, version 0
+      Uplinks: pnic1, pnic2
+    ENS: activation node not set; active on (none)
+    Uplink timeouts: (none)
+    LAG timeouts: (none)
+  
+  Stored configuration
+    Standard switch vswitch0: 128 ports, MTU 1500, CDP listen
+      Uplinks: pnic0
+      Teaming: flags 0x10, order pnic0, max active 1, balancing 0, failback 0
+      Port group Management: VLAN 0, clients vm1
+        Teaming: flags 0x0, order (not set), max active 0, balancing 0, failback 0
+    Standard switch sys0 (system): 64 ports, MTU 1500, CDP listen
+      Uplinks: (none)
+      Teaming: flags 0x10, order (none), max active 0, balancing 0, failback 0
+    Uplink timeouts: vswitch0 pnic0 LAG 1: 5
+    LAG timeouts: ps0 LAG 2: 255
+  
+  Distributed switch cache
+    Distributed switch dvs0: portset ps0, id dvs-dvs0, 128 ports, MTU 1500
+      UUID 64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00, class cswitch, version 0
+      Uplinks: pnic1, pnic2
+  
+  Opaque switches
+    opq0: portset opq0, 128 ports, 3 used, uplinks pnic3
+  
+  DVPorts
+    dvs0 port 10: connection id 7, clients vmA, vmB
+  
+  Events
+    (none)
+  
+  Faults
+    SetVlanId on pg2: lets 1 pass, then fails 1; message "boom", detail "injected fault in SetVlanId"
+    -odd: lets 0 pass, then fails 1; message "injected fault", detail "injected fault in -odd"
+  $ tarnhost dump > seeded.json
+  $ tarnhost fault clear
+  $ tarnhost reboot
+  $ tarnhost show | sed -n '/^Running/,/^Stored/p'
+  Running state
+    Standard switches: (none)
+    Distributed switches: (none)
+    ENS: activation node not set; active on (none)
+    Uplink timeouts: (none)
+    LAG timeouts: (none)
+  
+  Stored configuration
+  $ tarnhost load - < seeded.json
+  $ tarnhost dump | cmp - seeded.json
+
+A faulty dump or file is refused and the host stays as it was.
+
+  $ sed 's/"version": 1/"version": 9/' seeded.json > v9.json
+  $ refused tarnhost load v9.json
+  status 1
+  tarnhost: Cannot load dump: unsupported version 9 (this host reads version 1)
+  $ head -c 300 seeded.json > cut.json
+  $ refused tarnhost load cut.json
+  status 1
+  tarnhost: Cannot load dump: not valid JSON: parse error at line 21, column 8: syntax error while parsing object key - unexpected end of input; expected string literal
+  $ refused tarnhost load nosuch.json
+  status 1
+  tarnhost: cannot read nosuch.json: No such file or directory
+  $ tarnhost dump | cmp - seeded.json
