@@ -21,6 +21,9 @@ namespace TarnCtl::Detail {
 HostCtl::Lib::HostCtlException Refusal(const std::string& operation, const std::string& message,
                                        const std::string& where = "");
 
+// A refusal of the operation that is running (Call::Running()).
+HostCtl::Lib::HostCtlException Refused(const std::string& message, const std::string& where = "");
+
 // A database failure on the file at `path`, with SQLite's text `cause`.
 HostCtl::Lib::HostCtlException DatabaseError(const std::string& path, const std::string& cause);
 
