@@ -651,7 +651,7 @@ class Loader : public nlohmann::json_sax<json> {
   std::vector<std::string> NamesValue(const Column& c, const json& v) {
     if (!v.is_array()) BadField(c, "must be an array of names");
     std::vector<std::string> names;
-    const Column element{c.name, Kind::Text, 1, 31};
+    const Column element{c.name, Kind::Text, 0, kMax64};
     for (const auto& item : v) names.push_back(TextValue(element, item));
     return names;
   }
