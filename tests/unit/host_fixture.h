@@ -15,6 +15,8 @@
 #include <vector>
 
 #include "hostctl/exception.h"
+#include "hostctl/tarnctl.h"
+#include "tarnctl/admin.h"
 
 class HostTest : public ::testing::Test {
  protected:
@@ -81,6 +83,42 @@ class HostTest : public ::testing::Test {
       return e.GetMessage();
     }
     return "";
+  }
+
+  // The sample host: the default host (vswitch0 on pnic0, port group
+  // Management) plus
+  //  - vs1 (64 ports) on pnic1 with port groups pg1 (clients vm-a, vm-b)
+  //    and pg2;
+  //  - dvs0 (portset dvs0-ps, id dvs-dvs0) on pnic2 with DVPorts 100
+  //    (client vm-c, connection id 5) and 101;
+  //  - the opaque switch op0 (portset op0-ps) holding pnic3;
+  //  - pnic4, free.
+  static void SeedSampleHost() {
+    namespace HN = HostCtl::Network;
+    TarnCtl::Admin::Host host;
+    host.AddPnic("pnic4");
+    TarnCtl::Network::VirtualSwitchInfoImpl info;
+    auto vs1 = info.AddVirtualSwitch(
+        HN::NicTeamingPolicy::GetDefaultPolicy(), HN::PortSecurityPolicy::GetDefaultPolicy(),
+        HN::ShapingPolicy::GetDefaultPolicy(), HN::NicCapabilities::GetDefaultPolicy(), "vs1", 64);
+    vs1->AddUplink("pnic1", true);
+    vs1->AddPortGroup("pg1");
+    vs1->AddPortGroup("pg2");
+    host.AddClient("pg1", "vm-a");
+    host.AddClient("pg1", "vm-b");
+    TarnCtl::Admin::DVSwitchSeed dvs;
+    dvs.name = "dvs0";
+    dvs.portset = "dvs0-ps";
+    dvs.switchId = "dvs-dvs0";
+    dvs.uplinks = {"pnic2"};
+    host.AddDVSwitch(dvs);
+    host.AddDVPort({"dvs0", "100", {"vm-c"}, 5});
+    host.AddDVPort({"dvs0", "101", {}, 0});
+    TarnCtl::Admin::OpaqueSeed opaque;
+    opaque.name = "op0";
+    opaque.portset = "op0-ps";
+    opaque.uplinks = {"pnic3"};
+    host.AddOpaqueSwitch(opaque);
   }
 
   std::string dir_;

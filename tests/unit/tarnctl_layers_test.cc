@@ -1,0 +1,177 @@
+// The two layers of the host: changes reach the stored configuration as
+// well as the running state (except where an operation says otherwise), a
+// reboot drops the running state, and the restore operations bring it back.
+#include "host_fixture.h"
+
+namespace {
+
+namespace HN = HostCtl::Network;
+using HN::NetworkFactory;
+using TarnCtl::Network::NetworkInfoImpl;
+using TarnCtl::Network::PortGroupImpl;
+
+using LayersTest = HostTest;
+
+std::string Join(const std::vector<std::string>& names) {
+  std::string text;
+  for (const auto& name : names) text += name + ",";
+  return text;
+}
+
+// The running state as the tool reads it, as text.
+std::string Running() {
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  std::string text;
+  for (bool system : {false, true}) {
+    for (const auto& sw : info->GetVirtualSwitches(system)) {
+      const auto policy = sw->GetTeamingPolicy();
+      text += "vs " + sw->GetName() + " " + std::to_string(sw->GetNumPorts()) + " " +
+              std::to_string(sw->GetUsedPorts()) + " " + std::to_string(sw->GetMTU()) + " " +
+              std::to_string(sw->GetCdpStatus()) + " [" + Join(sw->GetUplinks()) + "] [" +
+              Join(policy.uplinkOrder) + "] " + std::to_string(policy.maxActive) + "\n";
+      for (const auto& pg : sw->GetPortGroups()) {
+        const auto pgPolicy = pg->GetTeamingPolicy();
+        text += "  pg " + pg->GetName() + " " + std::to_string(pg->GetVlanId()) + " " +
+                std::to_string(pg->GetPorts().size()) + " " + std::to_string(pgPolicy.flags) +
+                " [" + Join(pgPolicy.uplinkOrder) + "]\n";
+      }
+    }
+  }
+  for (const auto& dvs : info->GetDVSwitches()) {
+    text += "dvs " + dvs->GetSwitchName() + " " + dvs->GetName() + " " + dvs->GetDVSwitchId() +
+            " " + std::to_string(dvs->GetMTU()) + " " + std::to_string(dvs->GetUsedPorts()) + " [" +
+            Join(dvs->GetUplinks()) + "]\n";
+  }
+  return text;
+}
+
+void Reboot() {
+  TarnCtl::Admin::Host().Reboot();
+}
+
+void RestoreAll() {
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  info->RestoreDVSwitches(NetworkInfoImpl::DefaultDVSCacheFile);
+  info->Refresh();
+  info->RestoreVirtualSwitches();
+  for (const auto& sw : info->GetVirtualSwitches(false)) sw->RestoreUplinks();
+}
+
+std::unique_ptr<HN::VirtualSwitch> Switch(const std::string& name) {
+  return NetworkFactory::GetVirtualSwitchById(name, HN::PORTSET_GET_DEFAULT);
+}
+
+TEST_F(LayersTest, RebootThenRestoreGivesBackTheRunningState) {
+  SeedSampleHost();
+  {
+    NetworkInfoImpl network;
+    auto info = network.GetVirtualSwitchInfo();
+    auto vs2 =
+        info->AddVirtualSwitch(HN::NicTeamingPolicy::GetDefaultPolicy(), {}, {}, {}, "vs2", 256);
+    vs2->AddUplink("pnic4", true);
+    vs2->SetMTU(9000);
+    vs2->SetCdpStatus(3);
+    auto policy = vs2->GetTeamingPolicy();
+    policy.SetUplinkOrder({"pnic4", "pnic9"});
+    policy.SetMaxActiveUplinks(1);
+    vs2->SetTeamingPolicy(policy);
+    vs2->AddPortGroup("pgA")->SetVlanId(10);
+    PortGroupImpl("pg2").SetTeamingPolicy(policy);
+    auto dvs = info->AddDVSwitch("00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 07", "dvs7",
+                                 "etherswitch", "dvs7", 32, 5, 0);
+    dvs->SetMTU(1600);
+  }
+  const std::string before = Running();
+  Reboot();
+  EXPECT_EQ(Running(), "");
+  EXPECT_THROW(Switch("vs1"), HostCtl::Lib::HostCtlException);
+  RestoreAll();
+  EXPECT_EQ(Running(), before);
+  // A second restore finds nothing missing.
+  RestoreAll();
+  EXPECT_EQ(Running(), before);
+}
+
+TEST_F(LayersTest, UplinkChangesReachTheLayersTheyName) {
+  {
+    NetworkInfoImpl network;
+    auto vs0 = Switch("vswitch0");
+    vs0->AddUplink("pnic1", false);  // running only
+    vs0->AddUplink("pnic2", true);   // both
+    vs0->AddUplink("pnic3", true);
+    vs0->RemoveUplink("pnic3", true);  // stored only: still running
+    EXPECT_EQ(vs0->GetUplinks(), (std::vector<std::string>{"pnic0", "pnic1", "pnic2", "pnic3"}));
+    EXPECT_EQ(vs0->GetUsedPorts(), 4u);
+  }
+  Reboot();
+  RestoreAll();
+  EXPECT_EQ(Switch("vswitch0")->GetUplinks(), (std::vector<std::string>{"pnic0", "pnic2"}));
+  // Removal from both layers stays removed after a reboot.
+  Switch("vswitch0")->RemoveUplink("pnic2", false);
+  Reboot();
+  RestoreAll();
+  EXPECT_EQ(Switch("vswitch0")->GetUplinks(), (std::vector<std::string>{"pnic0"}));
+}
+
+TEST_F(LayersTest, RestoreUplinksRefusesAPnicTakenByAnotherSwitch) {
+  SeedSampleHost();
+  Reboot();
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  info->RestoreVirtualSwitches();
+  Switch("vswitch0")->AddUplink("pnic1", false);
+  EXPECT_EQ(Refusal([] { Switch("vs1")->RestoreUplinks(); }),
+            "pnic1 is already linked to vswitch0");
+  EXPECT_EQ(Switch("vs1")->GetUplinks(), std::vector<std::string>{});
+  // A restored link takes its stored place in the order.
+  Switch("vswitch0")->RestoreUplinks();
+  EXPECT_EQ(Switch("vswitch0")->GetUplinks(), (std::vector<std::string>{"pnic0", "pnic1"}));
+}
+
+TEST_F(LayersTest, RemovingASwitchRemovesItEverywhere) {
+  SeedSampleHost();
+  {
+    NetworkInfoImpl network;
+    auto info = network.GetVirtualSwitchInfo();
+    Switch("vs1")->RemovePortGroup("pg2");
+    info->RemoveVirtualSwitch("vswitch0");
+    auto names = network.GetAllPortGroupNames(HN::PORTSET_GET_DEFAULT);
+    EXPECT_EQ(names, (std::set<std::string>{"pg1"}));
+    // The pnic of the removed switch is free again.
+    Switch("vs1")->AddUplink("pnic0", true);
+  }
+  Reboot();
+  RestoreAll();
+  NetworkInfoImpl network;
+  EXPECT_FALSE(network.GetVirtualSwitchInfo()->SwitchExists("vswitch0"));
+  EXPECT_EQ(network.GetAllPortGroupNames(HN::PORTSET_GET_DEFAULT), (std::set<std::string>{"pg1"}));
+  EXPECT_EQ(Switch("vs1")->GetUplinks(), (std::vector<std::string>{"pnic1", "pnic0"}));
+}
+
+// Distributed switches come back from the cache; removing one removes it
+// from the cache too.
+TEST_F(LayersTest, DistributedSwitchesLiveInTheCache) {
+  SeedSampleHost();
+  Reboot();
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  EXPECT_TRUE(info->GetDVSwitches().empty());
+  EXPECT_EQ(info->GetOpaqueSwitches().size(), 1u);  // kept across reboots
+  info->RestoreDVSwitches(NetworkInfoImpl::DefaultDVSCacheFile);
+  auto dvs = NetworkFactory::GetDVSwitchByName("dvs0");
+  EXPECT_EQ(dvs->GetUplinks(), std::vector<std::string>{"pnic2"});
+  EXPECT_EQ(dvs->GetUsedPorts(), 2u);  // one uplink, one DVPort with a client
+  EXPECT_EQ(Refusal([&] { info->RemoveVirtualSwitch("dvs0"); }), "DVS dvs0 has 1 ports in use");
+
+  info->AddDVSwitch("00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 09", "dvs9", "cswitch", "dvs9",
+                    64, 6, 0);
+  info->RemoveVirtualSwitch("dvs9");
+  Reboot();
+  info->RestoreDVSwitches(NetworkInfoImpl::DefaultDVSCacheFile);
+  EXPECT_EQ(info->GetDVSwitches().size(), 1u);
+  EXPECT_EQ(Refusal([] { NetworkFactory::GetDVSwitchByName("dvs9"); }), "DVS dvs9 does not exist");
+}
+
+}  // namespace

@@ -1,0 +1,239 @@
+// The platform's refusals, through the interface the tool uses: each one a
+// HostCtlException with a short message and a detailed message that starts
+// with the operation's name, and none of them changes the host.
+#include "host_fixture.h"
+#include "hostctl/nodi.h"
+
+namespace {
+
+namespace HN = HostCtl::Network;
+using HN::NetworkFactory;
+using TarnCtl::Network::DVPortImpl;
+using TarnCtl::Network::NetworkInfoImpl;
+using TarnCtl::Network::PortGroupImpl;
+using TarnCtl::Network::VirtualSwitchImpl;
+
+using RefusalTest = HostTest;
+
+HN::NicTeamingPolicy Policy(std::vector<std::string> order, int32_t maxActive) {
+  HN::NicTeamingPolicy policy;
+  policy.flags = HN::NicTeamingPolicy::kUplinkOrderSet;
+  policy.uplinkOrder = std::move(order);
+  policy.maxActive = maxActive;
+  return policy;
+}
+
+std::unique_ptr<HN::VirtualSwitch> AddSwitch(HN::VirtualSwitchInfo& info, const std::string& name,
+                                             int32_t ports,
+                                             HN::NicTeamingPolicy teaming = Policy({}, 0)) {
+  return info.AddVirtualSwitch(teaming, {}, {}, {}, name, ports);
+}
+
+std::unique_ptr<HN::VirtualSwitch> Switch(const std::string& name) {
+  return NetworkFactory::GetVirtualSwitchById(name, HN::PORTSET_GET_DEFAULT);
+}
+
+std::unique_ptr<HN::DVSwitch> Dvs(const std::string& name) {
+  return NetworkFactory::GetDVSwitchByName(name);
+}
+
+constexpr const char* kUuid = "01 02 03 04 05 06 07 08-09 0a 0b 0c 0d 0e 0f 10";
+
+struct Case {
+  const char* operation;
+  std::function<void(HN::VirtualSwitchInfo&)> call;
+  std::string message;
+};
+
+TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
+  SeedSampleHost();
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  TarnCtl::Admin::Host admin;
+  const std::vector<Case> cases = {
+      // Switch creation: names, ports, policy.
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "vs1", 64); },
+       "Virtual switch vs1 already exists"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "dvs0-ps", 64); },
+       "Virtual switch dvs0-ps already exists"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "op0", 64); },
+       "Virtual switch op0 already exists"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "", 64); }, "Virtual switch name is empty"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, std::string(32, 'x'), 64); },
+       "Virtual switch name " + std::string(32, 'x') + " is too long"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 0); }, "Invalid number of ports 0"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 7); }, "Invalid number of ports 7"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 4097); },
+       "Invalid number of ports 4097"},
+      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 64, Policy({"pnic4"}, -1)); },
+       "Invalid max active uplinks -1"},
+      {"AddDVSwitch", [](auto& i) { i.AddDVSwitch("01 02 03", "d1", "cswitch", "d1", 128, 6, 0); },
+       "Invalid UUID 01 02 03"},
+      {"AddDVSwitch", [](auto& i) { i.AddDVSwitch(kUuid, "d1", "other", "d1", 128, 6, 0); },
+       "Unknown implementation class other"},
+      {"AddDVSwitch", [](auto& i) { i.AddDVSwitch(kUuid, "d1", "cswitch", "d1", 128, -1, 0); },
+       "Invalid DVS version -1"},
+      {"AddDVSwitch", [](auto& i) { i.AddDVSwitch(kUuid, "d1", "cswitch", "d1", 0, 6, 0); },
+       "Invalid number of ports 0"},
+      {"AddDVSwitch", [](auto& i) { i.AddDVSwitch(kUuid, "vs1", "cswitch", "vs1", 128, 6, 0); },
+       "Virtual switch vs1 already exists"},
+      // Removal while ports are in use, and of what cannot be removed.
+      {"RemoveVirtualSwitch", [](auto& i) { i.RemoveVirtualSwitch("vs1"); },
+       "Virtual switch vs1 has 2 ports in use"},
+      {"RemoveVirtualSwitch", [](auto& i) { i.RemoveVirtualSwitch("dvs0"); },
+       "DVS dvs0 has 1 ports in use"},
+      {"RemoveVirtualSwitch", [](auto& i) { i.RemoveVirtualSwitch("op0"); },
+       "Opaque switch op0 cannot be removed"},
+      {"RemoveVirtualSwitch", [](auto& i) { i.RemoveVirtualSwitch("nosuch"); },
+       "Virtual switch nosuch does not exist"},
+      {"RemovePortGroup", [](auto&) { Switch("vs1")->RemovePortGroup("pg1"); },
+       "Portgroup pg1 has 2 ports in use"},
+      {"RemovePortGroup", [](auto&) { Switch("vswitch0")->RemovePortGroup("pg2"); },
+       "Portgroup pg2 does not exist"},
+      // Port groups.
+      {"AddPortGroup", [](auto&) { Switch("vswitch0")->AddPortGroup("pg1"); },
+       "Portgroup pg1 already exists"},
+      {"AddPortGroup", [](auto&) { Switch("vswitch0")->AddPortGroup(""); },
+       "Portgroup name is empty"},
+      {"AddPortGroup", [](auto&) { Switch("vswitch0")->AddPortGroup(std::string(128, 'p')); },
+       "Portgroup name " + std::string(128, 'p') + " is too long"},
+      {"SetVlanId", [](auto&) { PortGroupImpl("pg2").SetVlanId(4096); },
+       "VLAN id 4096 is out of range"},
+      // Uplinks.
+      {"AddUplink", [](auto&) { Switch("vswitch0")->AddUplink("pnic9", true); },
+       "Uplink pnic9 does not exist"},
+      {"AddUplink", [](auto&) { Switch("vswitch0")->AddUplink("pnic1", true); },
+       "pnic1 is already linked to vs1"},
+      {"AddUplink", [](auto&) { Switch("vswitch0")->AddUplink("pnic0", false); },
+       "pnic0 is already linked to vswitch0"},
+      {"AddUplink", [](auto&) { Switch("vswitch0")->AddUplink("pnic2", true); },
+       "pnic2 is already linked to dvs0"},
+      {"AddUplink", [](auto&) { Switch("vswitch0")->AddUplink("pnic3", true); },
+       "pnic3 is already linked to op0"},
+      {"RemoveUplink", [](auto&) { Switch("vs1")->RemoveUplink("pnic0", false); },
+       "pnic0 is not linked to vs1"},
+      {"RemoveUplink", [](auto&) { Switch("vs1")->RemoveUplink("pnic4", true); },
+       "pnic4 is not linked to vs1"},
+      // Settings.
+      {"SetMTU", [](auto&) { Switch("vs1")->SetMTU(1279); }, "MTU 1279 is out of range"},
+      {"SetMTU", [](auto&) { Switch("vs1")->SetMTU(9001); }, "MTU 9001 is out of range"},
+      {"SetMTU", [](auto&) { Dvs("dvs0")->SetMTU(100); }, "MTU 100 is out of range"},
+      {"SetCdpStatus", [](auto&) { Switch("vs1")->SetCdpStatus(4); }, "Invalid CDP status 4"},
+      {"SetCdpStatus", [](auto&) { Switch("vs1")->SetCdpStatus(-1); }, "Invalid CDP status -1"},
+      {"ParseCdpStatus", [](auto&) { VirtualSwitchImpl::ParseCdpStatus("Both"); },
+       "Unknown CDP status Both"},
+      {"SetMaxActiveUplinks", [](auto&) { HN::NicTeamingPolicy().SetMaxActiveUplinks(-1); },
+       "Invalid max active uplinks -1"},
+      {"SetTeamingPolicy",
+       [](auto&) {
+         Switch("vs1")->SetTeamingPolicy(Policy({"a", "b", "a"}, 1));
+       },
+       "Uplink a appears twice in the teaming order"},
+      {"SetTeamingPolicy", [](auto&) { Switch("vs1")->SetTeamingPolicy(Policy({}, -2)); },
+       "Invalid max active uplinks -2"},
+      {"SetTeamingPolicy", [](auto&) { PortGroupImpl("pg1").SetTeamingPolicy(Policy({}, -1)); },
+       "Invalid max active uplinks -1"},
+      // Lookups of unknown names.
+      {"GetVirtualSwitchById", [](auto&) { Switch("nosuch"); },
+       "Virtual switch nosuch does not exist"},
+      {"GetVirtualSwitchById", [](auto&) { Switch("dvs0"); }, "Virtual switch dvs0 does not exist"},
+      {"GetPortsetById", [](auto&) { NetworkFactory::GetPortsetById("dvs0"); },
+       "Portset dvs0 does not exist"},
+      {"GetDVSwitchByName", [](auto&) { Dvs("vs1"); }, "DVS vs1 does not exist"},
+      {"GetDVSwitchByName", [](auto&) { Dvs("op0"); }, "DVS op0 does not exist"},
+      {"PortGroupImpl", [](auto&) { PortGroupImpl("PG1"); }, "Portgroup PG1 does not exist"},
+      {"GetUplinkTimeoutConfig", [](auto& i) { i.GetUplinkTimeoutConfig("vs9", 0, ""); },
+       "Portset vs9 does not exist"},
+      {"LoadLagTimeoutConfig", [](auto& i) { i.LoadLagTimeoutConfig("dvs0", 0); },
+       "Portset dvs0 does not exist"},
+      {"RestoreDVSwitches", [](auto& i) { i.RestoreDVSwitches("/tmp/other-cache"); },
+       "Cannot open distributed switch cache /tmp/other-cache"},
+      // Distributed switches and their ports.
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic4", {"dvs-dvs0", "100", 4});
+       },
+       "Stale connection id 4 for DVPort 100"},
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic4", {"dvs-dvs0", "101", 0});
+       },
+       "Stale connection id 0 for DVPort 101"},
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic4", {"dvs-dvs0", "102", 5});
+       },
+       "DVPort 102 does not exist"},
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic4", {"dvs-other", "100", 5});
+       },
+       "DVPort 100 does not belong to DVS dvs0"},
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic1", {"dvs-dvs0", "100", 5});
+       },
+       "pnic1 is already linked to vs1"},
+      {"AddDVPortUplink",
+       [](auto&) {
+         Dvs("dvs0")->AddDVPortUplink("pnic9", {"dvs-dvs0", "100", 5});
+       },
+       "Uplink pnic9 does not exist"},
+      {"RemoveDVPortUplink", [](auto&) { Dvs("dvs0")->RemoveDVPortUplink("pnic1", 0); },
+       "pnic1 is not an uplink of DVS dvs0"},
+      {"SetConnectionId",
+       [](auto&) {
+         DVPortImpl({"dvs-dvs0", "999", 0}).SetConnectionId(1);
+       },
+       "DVPort 999 does not exist"},
+      {"SetMTU", [](auto& i) { i.GetOpaqueSwitches().at(0)->SetMTU(1500); },
+       "Opaque switch op0 cannot be changed"},
+      // ENS.
+      {"ActivateEns",
+       [](auto&) { NetworkFactory::GetPortsetById("vs1")->ActivateEns(false, false); },
+       "ENS is not enabled on this host"},
+      {"DeactivateEns", [](auto&) { NetworkFactory::GetPortsetById("dvs0-ps")->DeactivateEns(); },
+       "ENS is not active on dvs0-ps"},
+      {"ReassociateEnsUplinks",
+       [](auto&) {
+         NetworkFactory::GetPortsetById("op0-ps")->ReassociateEnsUplinks(true, false, 0, 0);
+       },
+       "Opaque switch op0 cannot be changed"},
+  };
+  const std::string before = admin.Dump();
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.message);
+    try {
+      c.call(*info);
+      ADD_FAILURE() << c.operation << " was not refused";
+    } catch (const HostCtl::Lib::HostCtlException& e) {
+      EXPECT_EQ(e.GetMessage().substr(0, c.message.size()), c.message);
+      EXPECT_EQ(e.GetDetailedMessage().rfind(std::string(c.operation) + ": " + c.message, 0), 0u)
+          << e.GetDetailedMessage();
+      EXPECT_EQ(e.GetMessage().find(path_), std::string::npos);
+    }
+  }
+  EXPECT_EQ(admin.Dump(), before);
+}
+
+// Refusals that depend on what happened before: a name or pnic that was
+// free becomes taken, and a used-up state refuses again.
+TEST_F(RefusalTest, ARefusalFollowsTheStateItDependsOn) {
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  auto vs1 = AddSwitch(*info, "vs1", 128);
+  vs1->AddUplink("pnic1", true);
+  EXPECT_EQ(Refusal([&] { vs1->AddUplink("pnic1", true); }), "pnic1 is already linked to vs1");
+  vs1->RemoveUplink("pnic1", false);
+  EXPECT_EQ(Refusal([&] { vs1->RemoveUplink("pnic1", false); }), "pnic1 is not linked to vs1");
+  EXPECT_EQ(Refusal([&] { vs1->RemoveUplink("pnic1", true); }), "pnic1 is not linked to vs1");
+  vs1->AddPortGroup("pg1");
+  vs1->RemovePortGroup("pg1");
+  EXPECT_EQ(Refusal([&] { vs1->AddPortGroup("pg1"); }), "");
+  info->RemoveVirtualSwitch("vs1");
+  EXPECT_EQ(Refusal([&] { vs1->GetMTU(); }), "Virtual switch vs1 does not exist");
+  EXPECT_EQ(Refusal([&] { AddSwitch(*info, "vs1", 8); }), "");
+  EXPECT_EQ(Refusal([&] { AddSwitch(*info, std::string(31, 'n'), 4096); }), "");
+}
+
+}  // namespace
