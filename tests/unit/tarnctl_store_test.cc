@@ -6,6 +6,7 @@
 #include <thread>
 
 #include "host_fixture.h"
+#include "hostctl/tarnctl.h"
 #include "tarnctl/admin.h"
 #include "tarnctl/schema.h"
 #include "tarnctl/session.h"
@@ -115,6 +116,27 @@ TEST_F(StoreTest, ADatabaseErrorNamesTheFileAndRollsBack) {
   EXPECT_NE(message.find(path_), std::string::npos) << message;
   EXPECT_NE(message.find("UNIQUE"), std::string::npos) << message;
   EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM pnic WHERE name = 'pnic50'"), 0);
+}
+
+// A full disk in the middle of a change: the change is undone whole and
+// the failure names the file.
+TEST_F(StoreTest, AFullDatabaseRefusesTheChangeWhole) {
+  TarnCtl::Network::NetworkInfoImpl network;
+  auto session = Session::Current();
+  const int64_t pages = CountRows(*session, "PRAGMA page_count");
+  const std::string limit = "PRAGMA max_page_count=" + std::to_string(pages + 2);
+  session->Exec(limit.c_str());
+  auto vs0 = HostCtl::Network::NetworkFactory::GetVirtualSwitchById(
+      "vswitch0", HostCtl::Network::PORTSET_GET_DEFAULT);
+  std::string message;
+  for (int i = 0; i < 2000 && message.empty(); ++i) {
+    message = Refusal([&] { vs0->AddPortGroup("pg" + std::to_string(i) + std::string(100, 'x')); });
+  }
+  EXPECT_NE(message.find(path_), std::string::npos) << message;
+  EXPECT_NE(message.find("full"), std::string::npos) << message;
+  EXPECT_EQ(CountRows(*session, "SELECT count(*) FROM portgroup WHERE layer = 0"),
+            CountRows(*session, "SELECT count(*) FROM portgroup WHERE layer = 1"));
+  EXPECT_GT(CountRows(*session, "SELECT count(*) FROM portgroup"), 2);
 }
 
 TEST_F(StoreTest, ASecondProcessWaitsForTheLockAndThenGivesUp) {
