@@ -57,7 +57,7 @@ void CheckPortsetNameFree(Session& s, const std::string& op, const std::string& 
       "SELECT 1 FROM vswitch WHERE name = ?1"
       " UNION ALL SELECT 1 FROM dvswitch WHERE name = ?1 OR portset = ?1"
       " UNION ALL SELECT 1 FROM opaque WHERE name = ?1 OR portset = ?1 LIMIT 1");
-  if (stmt.Bind(1, name).Step()) Refuse(op, "Switch or portset " + name + " already exists");
+  if (stmt.Bind(1, name).Step()) Refuse(op, "Virtual switch " + name + " already exists");
 }
 
 bool PnicExists(Session& s, const std::string& name) {
@@ -154,7 +154,7 @@ void Host::AddSystemSwitch(const std::string& name, int32_t ports) {
   const std::string op = "AddSystemSwitch";
   Session& s = *state_->session;
   Transaction tx(s);
-  CheckShortName(op, "Switch", name);
+  CheckShortName(op, "Virtual switch", name);
   CheckPortsetNameFree(s, op, name);
   CheckPorts(op, ports);
   HostCtl::Network::NicTeamingPolicy policy;
@@ -180,14 +180,14 @@ void Host::AddDVSwitch(const DVSwitchSeed& seed) {
   Session& s = *state_->session;
   Transaction tx(s);
   const std::string portset = seed.portset.value_or(seed.name);
-  CheckShortName(op, "Switch", seed.name);
+  CheckShortName(op, "Virtual switch", seed.name);
   CheckShortName(op, "Portset", portset);
   CheckPortsetNameFree(s, op, seed.name);
   if (portset != seed.name) CheckPortsetNameFree(s, op, portset);
   CheckPorts(op, seed.ports);
   if (seed.mtu < kMinMtu || seed.mtu > kMaxMtu) {
-    Refuse(op, "Invalid MTU " + std::to_string(seed.mtu) + ": must be " + std::to_string(kMinMtu) +
-                   " to " + std::to_string(kMaxMtu));
+    Refuse(op, "MTU " + std::to_string(seed.mtu) + " is out of range (" + std::to_string(kMinMtu) +
+                   " to " + std::to_string(kMaxMtu) + ")");
   }
   std::string id;
   if (seed.switchId) {
@@ -235,7 +235,7 @@ void Host::AddDVPort(const DVPortSeed& seed) {
   Transaction tx(s);
   auto sw = s.Prepare("SELECT num_ports FROM dvswitch WHERE layer = 1 AND name = ?1");
   if (!sw.Bind(1, seed.dvs).Step()) {
-    Refuse(op, "Distributed switch " + seed.dvs + " does not exist");
+    Refuse(op, "DVS " + seed.dvs + " does not exist");
   }
   const int64_t ports = sw.Int(0);
   if (seed.portId.empty()) Refuse(op, "DVPort id is empty");
@@ -276,7 +276,7 @@ void Host::AddOpaqueSwitch(const OpaqueSeed& seed) {
   Session& s = *state_->session;
   Transaction tx(s);
   const std::string portset = seed.portset.value_or(seed.name);
-  CheckShortName(op, "Switch", seed.name);
+  CheckShortName(op, "Virtual switch", seed.name);
   CheckShortName(op, "Portset", portset);
   CheckPortsetNameFree(s, op, seed.name);
   if (portset != seed.name) CheckPortsetNameFree(s, op, portset);

@@ -301,7 +301,7 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   tarnhost: Portgroup nosuch does not exist
   $ refused tarnhost system-switch add vswitch0
   status 1
-  tarnhost: Switch or portset vswitch0 already exists
+  tarnhost: Virtual switch vswitch0 already exists
   $ refused tarnhost system-switch add s1 --ports 4097
   status 1
   tarnhost: Invalid number of ports 4097: must be 8 to 4096
@@ -313,13 +313,13 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   tarnhost: Uplink pnic9 does not exist
   $ refused tarnhost dvs add d1 --mtu 1279
   status 1
-  tarnhost: Invalid MTU 1279: must be 1280 to 9000
+  tarnhost: MTU 1279 is out of range (1280 to 9000)
   $ refused tarnhost dvs add 0123456789012345678901234567890123
   status 1
-  tarnhost: Switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
+  tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
   $ refused tarnhost dvport add nosuch 10
   status 1
-  tarnhost: Distributed switch nosuch does not exist
+  tarnhost: DVS nosuch does not exist
   $ refused tarnhost opaque add o1 --ports 16 --used 17
   status 1
   tarnhost: Invalid number of used ports 17: must be 0 to 16
@@ -423,3 +423,29 @@ A faulty dump or file is refused and the host stays as it was.
   status 1
   tarnhost: cannot read nosuch.json: No such file or directory
   $ tarnhost dump | cmp - seeded.json
+
+States that only the library makes (ENS, events, loaded timeouts, DVPort
+uplinks; after a reboot, clients and DVPorts whose port group or switch was
+replaced) survive a dump too.
+
+  $ tarnhost init
+  $ tarnhost client add Management vm1
+  $ tarnhost dvs add dA --portset P --uplinks pnic1
+  $ tarnhost dvport add dA 1 --client c1 --connection-id 3
+  $ tarnhost timeout uplink vswitch0 pnic0 1 5
+  $ orvocfg-vswitch -a vs1 && orvocfg-vswitch -L pnic2 vs1 && orvocfg-vswitch -A pg1 vs1 &&
+  > orvocfg-vswitch -v 10 -p pg1 vs1 && orvocfg-vswitch --ens-ready && orvocfg-vswitch -y -i vs1 &&
+  > orvocfg-vswitch -z vs1 && orvocfg-vswitch -O && orvocfg-vswitch -P pnic3 -V 1 dA
+  $ tarnhost dump > running.json && tarnhost load running.json && tarnhost dump | cmp - running.json
+  $ tarnhost reboot
+  $ orvocfg-vswitch -a --dvswitch P && orvocfg-vswitch -a vswitch0
+  $ tarnhost dump > rebooted.json && tarnhost load rebooted.json && tarnhost dump | cmp - rebooted.json
+  $ tarnhost show | sed -n '/^DVPorts/,$p'
+  DVPorts
+    dA port 1: connection id 3, clients c1
+  
+  Events
+    ENS reassociation on vs1: mode 1, force 0
+  
+  Faults
+    (none)

@@ -135,7 +135,7 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
        [](Host& h) {
          h.AddDVSwitch({"d", {}, {}, 128, 9001, {}});
        },
-       "Invalid MTU 9001"},
+       "MTU 9001 is out of range"},
       {"dvs id taken",
        [](Host& h) {
          h.AddDVSwitch({"d", {}, "dvs-dvs0", 128, 1500, {}});
@@ -150,7 +150,7 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
        [](Host& h) {
          h.AddDVPort({"nosuch", "1", {}, 0});
        },
-       "Distributed switch nosuch does not exist"},
+       "DVS nosuch does not exist"},
       {"dvport twice",
        [](Host& h) {
          h.AddDVPort({"dvs0", "100", {}, 0});
@@ -228,8 +228,9 @@ TEST_F(AdminTest, LoadRefusesFaultyDumpsAndKeepsTheHost) {
   Host host;
   Seed(host);
   const std::string good = host.Dump();
-  auto replaced = [&](const std::string& from, const std::string& to) {
-    auto at = good.find(from);
+  // The first (or with `last` the last) occurrence of `from` replaced.
+  auto replaced = [&](const std::string& from, const std::string& to, bool last = false) {
+    auto at = last ? good.rfind(from) : good.find(from);
     EXPECT_NE(at, std::string::npos) << from;
     std::string text = good;
     return at == std::string::npos ? text : text.replace(at, from.size(), to);
@@ -271,8 +272,14 @@ TEST_F(AdminTest, LoadRefusesFaultyDumpsAndKeepsTheHost) {
        replaced("\"switch\": \"vswitch0\",\n        \"seq\": 7",
                 "\"switch\": \"gone\",\n        \"seq\": 7"),
        "belongs to switch gone"},
-      {"dangling client", replaced("\"portgroup\": \"Management\"", "\"portgroup\": \"gone\""),
-       "client vm1 is on port group gone"},
+      {"dangling DVPort client",
+       replaced("\"port_id\": \"100\",\n        \"name\": \"vmA\"",
+                "\"port_id\": \"999\",\n        \"name\": \"vmA\""),
+       "client vmA is on DVPort 999, which does not exist"},
+      {"pnic linked twice",
+       replaced("\"pnic\": \"pnic1\",\n        \"dvs\": \"dvs0\"",
+                "\"pnic\": \"pnic0\",\n        \"dvs\": \"dvs0\"", true),
+       "pnic pnic0 is linked twice in the running state"},
       {"dangling uplink",
        replaced("\"uplinks\": [\n          \"pnic3\"", "\"uplinks\": [\n \"pnicX\""),
        "uplink pnicX of opaque switch opq0 is not a pnic"},
