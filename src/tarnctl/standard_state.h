@@ -41,4 +41,9 @@ class StandardState : public Network::PortsetImpl::State {
   Snapshot<StandardRow> row_;
 };
 
+// The standard switch state behind a standard switch object.
+inline StandardState& AsStandard(Network::PortsetImpl::State& state) {
+  return static_cast<StandardState&>(state);
+}
+
 }  // namespace TarnCtl::Detail

@@ -18,10 +18,6 @@ using Detail::Transaction;
 
 namespace {
 
-StandardState& Standard(PortsetImpl::State& state) {
-  return static_cast<StandardState&>(state);
-}
-
 bool Linked(Session& session, int64_t layer, const std::string& pnic, const std::string& sw) {
   return session.Prepare("SELECT 1 FROM link WHERE layer = ? AND pnic = ? AND switch = ?")
       .Bind(1, layer)
@@ -43,7 +39,7 @@ void Link(Session& session, int64_t layer, const std::string& pnic, const std::s
 }  // namespace
 
 void VirtualSwitchImpl::AddUplink(const std::string& pnic, bool flag) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "AddUplink", sw.CallTarget(), FormatArgs(pnic, flag));
   sw.Row();
   Session& session = *sw.session;
@@ -56,7 +52,7 @@ void VirtualSwitchImpl::AddUplink(const std::string& pnic, bool flag) {
 }
 
 void VirtualSwitchImpl::RemoveUplink(const std::string& pnic, bool configOnly) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "RemoveUplink", sw.CallTarget(), FormatArgs(pnic, configOnly));
   Session& session = *sw.session;
   if (configOnly) {
@@ -78,7 +74,7 @@ void VirtualSwitchImpl::RemoveUplink(const std::string& pnic, bool configOnly) {
 }
 
 void VirtualSwitchImpl::RestoreUplinks() {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "RestoreUplinks", sw.CallTarget(), "");
   sw.Row();
   Session& session = *sw.session;

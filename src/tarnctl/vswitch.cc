@@ -24,8 +24,13 @@ using HostCtl::Network::NicTeamingPolicy;
 
 namespace {
 
-StandardState& Standard(PortsetImpl::State& state) {
-  return static_cast<StandardState&>(state);
+// Runs `sql` (value ?1, switch name ?2) in a transaction of its own; the
+// statement names the switch in both layers.
+template <typename Value>
+void Update(StandardState& sw, const char* sql, const Value& value) {
+  Transaction transaction(*sw.session);
+  sw.session->Prepare(sql).Bind(1, value).Bind(2, sw.name()).Run();
+  transaction.Commit();
 }
 
 }  // namespace
@@ -46,7 +51,7 @@ int32_t VirtualSwitchImpl::ParseCdpStatus(const std::string& word) {
 }
 
 std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> VirtualSwitchImpl::GetPortGroups() {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "GetPortGroups", sw.CallTarget(), "");
   sw.Row();
   std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> groups;
@@ -63,7 +68,7 @@ std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> VirtualSwitchImpl::Get
 
 std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
     const std::string& name) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "AddPortGroup", sw.CallTarget(), FormatArgs(name));
   sw.Row();
   if (name.empty()) throw Refused("Portgroup name is empty");
@@ -98,7 +103,7 @@ std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
 }
 
 void VirtualSwitchImpl::RemovePortGroup(const std::string& name) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "RemovePortGroup", sw.CallTarget(), FormatArgs(name));
   sw.Row();
   Session& session = *sw.session;
@@ -122,63 +127,48 @@ void VirtualSwitchImpl::RemovePortGroup(const std::string& name) {
 }
 
 NicTeamingPolicy VirtualSwitchImpl::GetTeamingPolicy() {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "GetTeamingPolicy", sw.CallTarget(), "");
   return Detail::DecodeTeamingPolicy(sw.Row().policy);
 }
 
 void VirtualSwitchImpl::SetTeamingPolicy(NicTeamingPolicy policy) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "SetTeamingPolicy", sw.CallTarget(), FormatArgs(policy));
   sw.Row();
   Detail::CheckTeamingPolicy(policy);
-  Transaction transaction(*sw.session);
-  sw.session->Prepare("UPDATE vswitch SET policy = ? WHERE name = ?")
-      .Bind(1, Detail::EncodeTeamingPolicy(policy))
-      .Bind(2, sw.name())
-      .Run();
-  transaction.Commit();
+  Update(sw, "UPDATE vswitch SET policy = ?1 WHERE name = ?2", Detail::EncodeTeamingPolicy(policy));
 }
 
 int32_t VirtualSwitchImpl::GetCdpStatus() {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "GetCdpStatus", sw.CallTarget(), "");
   return sw.Row().cdp;
 }
 
 void VirtualSwitchImpl::SetCdpStatus(int32_t status) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "SetCdpStatus", sw.CallTarget(), FormatArgs(status));
   sw.Row();
   if (status < 0 || status > Detail::kMaxCdpStatus) {
     throw Refused("Invalid CDP status " + std::to_string(status),
                   "(0-" + std::to_string(Detail::kMaxCdpStatus) + ")");
   }
-  Transaction transaction(*sw.session);
-  sw.session->Prepare("UPDATE vswitch SET cdp = ? WHERE name = ?")
-      .Bind(1, status)
-      .Bind(2, sw.name())
-      .Run();
-  transaction.Commit();
+  Update(sw, "UPDATE vswitch SET cdp = ?1 WHERE name = ?2", int64_t{status});
 }
 
 uint32_t VirtualSwitchImpl::GetMTU() {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "GetMTU", sw.CallTarget(), "");
   return sw.Row().mtu;
 }
 
 void VirtualSwitchImpl::SetMTU(uint16_t mtu) {
-  StandardState& sw = Standard(*state_);
+  StandardState& sw = Detail::AsStandard(*state_);
   Call call(sw.session.get(), "SetMTU", sw.CallTarget(), FormatArgs(mtu));
   sw.Row();
   Detail::CheckMtu(mtu);
-  Transaction transaction(*sw.session);
-  sw.session->Prepare("UPDATE vswitch SET mtu = ? WHERE name = ?")
-      .Bind(1, mtu)
-      .Bind(2, sw.name())
-      .Run();
-  transaction.Commit();
+  Update(sw, "UPDATE vswitch SET mtu = ?1 WHERE name = ?2", int64_t{mtu});
 }
 
 }  // namespace TarnCtl::Network
