@@ -60,6 +60,16 @@ void CheckPortsetNameFree(Session& s, const std::string& op, const std::string& 
   if (stmt.Bind(1, name).Step()) Refuse(op, "Virtual switch " + name + " already exists");
 }
 
+// The names and port count of a new distributed or opaque switch.
+void CheckNewPortset(Session& s, const std::string& op, const std::string& name,
+                     const std::string& portset, int32_t ports) {
+  CheckShortName(op, "Virtual switch", name);
+  CheckShortName(op, "Portset", portset);
+  CheckPortsetNameFree(s, op, name);
+  if (portset != name) CheckPortsetNameFree(s, op, portset);
+  CheckPorts(op, ports);
+}
+
 bool PnicExists(Session& s, const std::string& name) {
   return s.Prepare("SELECT 1 FROM pnic WHERE name = ?1").Bind(1, name).Step();
 }
@@ -180,11 +190,7 @@ void Host::AddDVSwitch(const DVSwitchSeed& seed) {
   Session& s = *state_->session;
   Transaction tx(s);
   const std::string portset = seed.portset.value_or(seed.name);
-  CheckShortName(op, "Virtual switch", seed.name);
-  CheckShortName(op, "Portset", portset);
-  CheckPortsetNameFree(s, op, seed.name);
-  if (portset != seed.name) CheckPortsetNameFree(s, op, portset);
-  CheckPorts(op, seed.ports);
+  CheckNewPortset(s, op, seed.name, portset, seed.ports);
   if (seed.mtu < kMinMtu || seed.mtu > kMaxMtu) {
     Refuse(op, "MTU " + std::to_string(seed.mtu) + " is out of range (" + std::to_string(kMinMtu) +
                    " to " + std::to_string(kMaxMtu) + ")");
@@ -276,11 +282,7 @@ void Host::AddOpaqueSwitch(const OpaqueSeed& seed) {
   Session& s = *state_->session;
   Transaction tx(s);
   const std::string portset = seed.portset.value_or(seed.name);
-  CheckShortName(op, "Virtual switch", seed.name);
-  CheckShortName(op, "Portset", portset);
-  CheckPortsetNameFree(s, op, seed.name);
-  if (portset != seed.name) CheckPortsetNameFree(s, op, portset);
-  CheckPorts(op, seed.ports);
+  CheckNewPortset(s, op, seed.name, portset, seed.ports);
   if (seed.used < 0 || seed.used > seed.ports) {
     Refuse(op, "Invalid number of used ports " + std::to_string(seed.used) + ": must be 0 to " +
                    std::to_string(seed.ports));

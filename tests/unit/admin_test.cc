@@ -3,36 +3,23 @@
 // without touching the host.
 #include <gtest/gtest.h>
 #include <stdlib.h>
-#include <unistd.h>
 
-#include <filesystem>
 #include <functional>
 #include <string>
 
 #include "hostctl/exception.h"
 #include "tarnctl/admin.h"
+#include "host_fixture.h"
 
 namespace {
 
 using HostCtl::Lib::HostCtlException;
-using TarnCtl::Admin::DVPortSeed;
-using TarnCtl::Admin::DVSwitchSeed;
-using TarnCtl::Admin::FaultSeed;
 using TarnCtl::Admin::Host;
-using TarnCtl::Admin::OpaqueSeed;
 
-// Each test gets a host database of its own.
-class AdminTest : public ::testing::Test {
+// Each test gets a host database of its own (HostTest), and may switch to
+// another file beside it.
+class AdminTest : public HostTest {
  protected:
-  void SetUp() override {
-    char dir[] = "/tmp/admin_test.XXXXXX";
-    ASSERT_NE(mkdtemp(dir), nullptr);
-    dir_ = dir;
-    UseDatabase("host.db");
-    unsetenv("TARN_TRACE");
-  }
-  void TearDown() override { std::filesystem::remove_all(dir_); }
-
   void UseDatabase(const std::string& name) {
     setenv("TARN_HOST_DB", (dir_ + "/" + name).c_str(), 1);
   }
@@ -54,8 +41,6 @@ class AdminTest : public ::testing::Test {
     host.AddFault({"SetVlanId", "pg2", "boom", "boom in detail", 1, 2});
     host.AddFault({"GetName", std::nullopt, std::nullopt, std::nullopt, 0, 1});
   }
-
-  std::string dir_;
 };
 
 TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
