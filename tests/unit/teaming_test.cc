@@ -44,7 +44,9 @@ void Expect(const TeamingCase& c, bool changed, const NicTeamingPolicy& policy,
   // Fields the edits have no business with survive them.
   EXPECT_EQ(policy.flags & 0x3, 0x3u);
   EXPECT_EQ(policy.balancing, 7);
-  if (changed) EXPECT_NE(policy.flags & NicTeamingPolicy::kUplinkOrderSet, 0u);
+  if (changed) {
+    EXPECT_NE(policy.flags & NicTeamingPolicy::kUplinkOrderSet, 0u);
+  }
 }
 
 TEST(AddUplinkToTeaming, InsertsBehindTheActiveUplinks) {

@@ -1,0 +1,40 @@
+Existence checks (-c, -C): "1" or "0", status 0 either way.
+
+  $ . "$TESTDIR/setup.sh"
+  $ tarnhost init
+  $ tarnhost dvs add dvs0
+  $ export TARN_TRACE=$PWD/trace
+
+A distributed switch answers the lookup; SwitchExists is not asked then.
+
+  $ orvocfg-vswitch -c dvs0
+  1
+  $ grep -c SwitchExists trace
+  0
+  [1]
+  $ orvocfg-vswitch -c vswitch0; orvocfg-vswitch -c vswitch9; orvocfg-vswitch -c Vswitch0
+  1
+  0
+  0
+  $ grep -c 'SwitchExists("vswitch9")' trace
+  1
+
+-C looks through the port groups of every switch, by exact name, and
+ignores any operand.
+
+  $ orvocfg-vswitch -a sw1 && orvocfg-vswitch -A Guests sw1
+  $ orvocfg-vswitch -C Guests; orvocfg-vswitch -C Management vswitch9; orvocfg-vswitch -C management
+  1
+  1
+  0
+
+Library failures are the run-wide handler's: nothing on standard output.
+
+  $ tarnhost fault add SwitchExists --detail 'switch table unreadable'
+  $ orvocfg-vswitch -c vswitch0
+  switch table unreadable
+  [1]
+  $ tarnhost fault add GetAllPortGroupNames --detail 'port group table unreadable'
+  $ orvocfg-vswitch -C Guests
+  port group table unreadable
+  [1]

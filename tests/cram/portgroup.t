@@ -1,0 +1,62 @@
+Port groups of a standard switch (-A, -D, -v with -p).
+
+  $ . "$TESTDIR/setup.sh"
+  $ tarnhost init
+  $ vlans() { orvocfg-vswitch -l | awk '/^  [A-Za-z]/ && $1 != "PortGroup" {print $1, $2}'; }
+
+The last of -A and -p names the port group; "ALL" is an ordinary name here.
+
+  $ orvocfg-vswitch -A pg1 vswitch0
+  $ orvocfg-vswitch -A pg9 -p pg2 vswitch0
+  $ orvocfg-vswitch -A ALL vswitch0
+  $ orvocfg-vswitch -D ALL vswitch0
+  $ vlans
+  Management 0
+  pg1 0
+  pg2 0
+
+Refusals by the library.
+
+  $ orvocfg-vswitch -A pg1 vswitch0
+  Failed to add portgroup: pg1 to vswitch: vswitch0, Error: * (glob)
+  [1]
+  $ tarnhost fault add RemovePortGroup --message 'in use'
+  $ orvocfg-vswitch -D pg1 vswitch0
+  Failed to remove portgroup: pg1, Error: in use
+  [1]
+
+-v sets one port group, or all of them with ALL; a refusal on one is
+reported and the others are still set.
+
+  $ orvocfg-vswitch -v 0x10 -p pg1 vswitch0
+  $ tarnhost fault add SetVlanId --on pg1 --message 'vlan refused'
+  $ orvocfg-vswitch -v 20 -p ALL vswitch0
+  Set vlan id to 20 failed for pg1, Error: vlan refused
+  [1]
+  $ vlans
+  Management 20
+  pg1 16
+  pg2 20
+  $ orvocfg-vswitch -v 30 -p all vswitch0
+  No such portgroup: all under vswitch: vswitch0
+  [1]
+
+ALL on a switch without port groups is silent.
+
+  $ orvocfg-vswitch -a empty && orvocfg-vswitch -v 5 -p ALL empty
+
+The port group list and the names read during the walk are not the
+command's to handle.
+
+  $ tarnhost fault add GetPortGroups --detail 'port groups unreadable'
+  $ orvocfg-vswitch -v 5 -p pg2 vswitch0
+  port groups unreadable
+  [1]
+  $ tarnhost fault add GetName --on pg1 --detail 'name unreadable'
+  $ orvocfg-vswitch -v 5 -p pg2 vswitch0
+  name unreadable
+  [1]
+  $ vlans
+  Management 20
+  pg1 16
+  pg2 20

@@ -1,0 +1,64 @@
+Creating and removing standard switches (-a, -d).
+
+  $ . "$TESTDIR/setup.sh"
+  $ tarnhost init
+  $ tarnhost dvs add dvs0
+  $ export TARN_TRACE=$PWD/trace
+
+-a takes the four default policies in a fixed order, then creates the switch
+with the teaming policy first and the port count last.
+
+  $ orvocfg-vswitch -a sw1:64
+  $ sed 1,2d trace
+  NicCapabilities::GetDefaultPolicy()
+  ShapingPolicy::GetDefaultPolicy()
+  PortSecurityPolicy::GetDefaultPolicy()
+  NicTeamingPolicy::GetDefaultPolicy()
+  AddVirtualSwitch({16, 0, 0, {0, 0, 0, 0}, [], 0}, {false, false, false}, {false, 0, 0, 0}, {0, 0}, "sw1", 64)
+  $ orvocfg-vswitch -c sw1
+  1
+
+A refused creation is one line naming the switch as given; a failing default
+policy is reported the same way and creates nothing.
+
+  $ orvocfg-vswitch -a sw1
+  Failed to add vswitch: sw1, Error: * (glob)
+  [1]
+  $ tarnhost fault add GetDefaultPolicy --skip 2 --message 'no shaping today'
+  $ orvocfg-vswitch -a sw2
+  Failed to add vswitch: sw2, Error: no shaping today
+  [1]
+  $ orvocfg-vswitch -c sw2
+  0
+
+-d admits only a standard switch, or with --dvswitch any switch.
+
+  $ orvocfg-vswitch -d dvs0
+  Not a valid virtual switch or it is a DVSwitch: dvs0
+  [1]
+  $ orvocfg-vswitch -d nosuch
+  Not a valid virtual switch or it is a DVSwitch: nosuch
+  [1]
+  $ orvocfg-vswitch -d --dvswitch nosuch
+  Not a valid virtual switch or it is a DVSwitch: nosuch
+  [1]
+  $ orvocfg-vswitch -c dvs0
+  1
+  $ orvocfg-vswitch -d --dvswitch dvs0 && orvocfg-vswitch -d --dvswitch sw1
+  $ orvocfg-vswitch -c dvs0; orvocfg-vswitch -c sw1
+  0
+  0
+
+Failures of the removal are the command's; failures of the admission check
+reach the run-wide handler.
+
+  $ tarnhost fault add RemoveVirtualSwitch --message 'switch busy'
+  $ orvocfg-vswitch -d vswitch0
+  Failed to remove vswitch: vswitch0, Error: switch busy
+  [1]
+  $ tarnhost fault add SwitchExists --detail 'lookup of vswitch0 failed in detail'
+  $ orvocfg-vswitch -d vswitch0
+  lookup of vswitch0 failed in detail
+  [1]
+  $ orvocfg-vswitch -d vswitch0 && orvocfg-vswitch -c vswitch0
+  0
