@@ -110,7 +110,7 @@ command's. A failed add still lets ENS be activated on the existing switch.
   GetPortsetById("vs1")
   ActivateEns(false, false) on vs1
   $ orvocfg-vswitch -a -y -i vs1
-  Failed to add vswitch: vs1, Error: * (glob)
+  Failed to add vswitch: vs1, Error: Virtual switch vs1 already exists
   [1]
   $ grep -c 'ActivateEns(true, false) on vs1' trace
   1

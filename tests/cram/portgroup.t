@@ -18,7 +18,7 @@ The last of -A and -p names the port group; "ALL" is an ordinary name here.
 Refusals by the library.
 
   $ orvocfg-vswitch -A pg1 vswitch0
-  Failed to add portgroup: pg1 to vswitch: vswitch0, Error: * (glob)
+  Failed to add portgroup: pg1 to vswitch: vswitch0, Error: Portgroup pg1 already exists
   [1]
   $ tarnhost fault add RemovePortGroup --message 'in use'
   $ orvocfg-vswitch -D pg1 vswitch0

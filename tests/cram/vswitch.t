@@ -22,7 +22,7 @@ A refused creation is one line naming the switch as given; a failing default
 policy is reported the same way and creates nothing.
 
   $ orvocfg-vswitch -a sw1
-  Failed to add vswitch: sw1, Error: * (glob)
+  Failed to add vswitch: sw1, Error: Virtual switch sw1 already exists
   [1]
   $ tarnhost fault add GetDefaultPolicy --skip 2 --message 'no shaping today'
   $ orvocfg-vswitch -a sw2
