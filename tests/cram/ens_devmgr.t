@@ -1,0 +1,66 @@
+Forced reassociation signals the device manager named by its PID file. The
+path is fixed, so this test owns it while it runs and leaves nothing behind.
+
+  $ . "$TESTDIR/setup.sh"
+  $ export TARN_TRACE=$PWD/trace
+  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ dir=/var/run/halden pidfile=/var/run/halden/tarndevmgr.pid made= pid=
+  $ if [ -e "$pidfile" ]; then exit 80; fi
+  $ cleanup() {
+  >   [ -n "$pid" ] && kill "$pid" 2>/dev/null
+  >   rm -f "$pidfile"
+  >   [ -n "$made" ] && rmdir "$dir"
+  > }
+  $ trap cleanup EXIT
+  $ if [ ! -d "$dir" ]; then mkdir -p "$dir" 2>/dev/null || exit 80; made=1; fi
+  $ [ -w "$dir" ] || exit 80
+
+No PID file: the message goes to standard output and nothing is reassociated.
+
+  $ orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
+  Failed to open /var/run/halden/tarndevmgr.pid
+  status 1
+  $ calls ReassociateEnsUplinks
+  [1]
+
+A PID file that names no single process is refused the same way: 0, no
+number, beyond the largest pid, negative as a pid.
+
+  $ for text in 0 '' abc 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648; do
+  >   printf '%s\n' "$text" > "$pidfile"
+  >   orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
+  > done
+  Failed to read device manager PID
+  status 1
+  Failed to read device manager PID
+  status 1
+  Failed to read device manager PID
+  status 1
+  Failed to read device manager PID
+  status 1
+  Failed to read device manager PID
+  status 1
+  Failed to read device manager PID
+  status 1
+  $ calls ReassociateEnsUplinks
+  [1]
+
+-z does not read the file.
+
+  $ orvocfg-vswitch -z vswitch0; echo $?
+  0
+  $ calls ReassociateEnsUplinks
+  ReassociateEnsUplinks(false, false, 0, 0) on vswitch0
+
+A valid PID (white space before it is skipped) gets the hang-up signal, and
+the reassociation is forced.
+
+  $ (sleep 30 & echo $! > sleeper; wait $!; echo "sleep ended with $?" > ended) 2>/dev/null &
+  $ until [ -s sleeper ]; do sleep 0.1; done; pid=$(cat sleeper)
+  $ printf ' \n  %s\n' "$pid" > "$pidfile"
+  $ orvocfg-vswitch -f vswitch0; echo $?
+  0
+  $ wait; pid=; cat ended
+  sleep ended with 129
+  $ calls ReassociateEnsUplinks
+  ReassociateEnsUplinks(false, true, 0, 0) on vswitch0

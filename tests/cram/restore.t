@@ -1,0 +1,99 @@
+Restore: switches from the stored configuration and the distributed switch
+cache (-r), and the uplinks of every standard switch (-R).
+
+  $ . "$TESTDIR/setup.sh"
+  $ export TARN_TRACE=$PWD/trace
+  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+
+A configured host comes back exactly as it was after a reboot and -r, -R.
+
+  $ orvocfg-vswitch -a vs1:64 && orvocfg-vswitch -a vs2 &&
+  > orvocfg-vswitch -A pgA vs1 && orvocfg-vswitch -A pgB vs1 && orvocfg-vswitch -A pgC vs2 &&
+  > orvocfg-vswitch -v 10 -p pgA vs1 && orvocfg-vswitch -v 4095 -p pgC vs2 &&
+  > orvocfg-vswitch -L pnic1 vs1 && orvocfg-vswitch -L pnic2 vs1 && orvocfg-vswitch -L pnic3 vs2 &&
+  > orvocfg-vswitch -M pnic2 -p pgA vs1 && orvocfg-vswitch -M pnic1 -p pgA vs1 &&
+  > orvocfg-vswitch -m 9000 vs1 && orvocfg-vswitch -a --dvswitch dvs0:32 &&
+  > orvocfg-vswitch -m 1600 dvs0; echo $?
+  0
+  $ orvocfg-vswitch -l > before; echo $?
+  0
+  $ cat before
+  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
+  vswitch0         128         1           128               1500    pnic0     
+  
+    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
+    Management                                0        0                     
+  
+  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
+  vs1              64          2           64                9000    pnic1,pnic2
+  
+    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
+    pgA                                       10       0           pnic2,pnic1
+    pgB                                       0        0                     
+  
+  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
+  vs2              128         1           128               1500    pnic3     
+  
+    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
+    pgC                                       4095     0                     
+  
+  DVS Name         Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
+  dvs0             32          0           32                1600              
+  
+    DVPort ID                               In Use      Client      
+  
+  $ tarnhost reboot
+  $ orvocfg-vswitch -l; echo "status $?"
+  status 1
+  $ : > trace
+  $ orvocfg-vswitch -r && orvocfg-vswitch -R; echo $?
+  0
+  $ calls 'RestoreDVSwitches|Refresh|RestoreVirtualSwitches|GetVirtualSwitches|RestoreUplinks'
+  RestoreDVSwitches("/etc/tarnhost/dvs-cache.db")
+  Refresh()
+  RestoreVirtualSwitches()
+  GetVirtualSwitches(false)
+  RestoreUplinks() on vswitch0
+  RestoreUplinks() on vs1
+  RestoreUplinks() on vs2
+  $ orvocfg-vswitch -l | diff before - && echo same
+  same
+
+When the distributed switches cannot be restored, the message alone is
+printed and the standard switches are restored all the same.
+
+  $ tarnhost reboot
+  $ tarnhost fault add RestoreDVSwitches --message 'cache unreadable' --detail 'cache unreadable in detail'
+  $ orvocfg-vswitch -r >/dev/null; echo "status $?"
+  cache unreadable
+  status 0
+  $ orvocfg-vswitch -c vs2 && orvocfg-vswitch -c dvs0
+  1
+  0
+
+A failure of the standard switch restore is not caught.
+
+  $ tarnhost reboot
+  $ tarnhost fault add RestoreVirtualSwitches --detail 'store unreadable in detail'
+  $ orvocfg-vswitch -r; echo "status $?"
+  store unreadable in detail
+  status 1
+
+-R stops at the first switch that fails; those before it stay restored.
+
+  $ tarnhost reboot
+  $ orvocfg-vswitch -r
+  $ tarnhost fault add RestoreUplinks --on vs1 --detail 'pnic1 is gone'
+  $ : > trace
+  $ orvocfg-vswitch -R; echo "status $?"
+  pnic1 is gone
+  status 1
+  $ calls RestoreUplinks
+  RestoreUplinks() on vswitch0
+  RestoreUplinks() on vs1
+
+On a host without standard switches -R does nothing.
+
+  $ tarnhost init --empty
+  $ orvocfg-vswitch -R; echo $?
+  0

@@ -1,0 +1,63 @@
+Uplink and LAG timeouts: loading the stored records and printing them as
+portset,uplink,lagid,timeout lines.
+
+  $ . "$TESTDIR/setup.sh"
+  $ export TARN_TRACE=$PWD/trace
+  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ tarnhost dvs add dvs9
+  $ tarnhost timeout uplink vswitch0 uplink1 1 1
+  $ tarnhost timeout uplink vswitch0 uplink2 1 0
+  $ tarnhost timeout uplink vswitch0 uplink1 16 65
+  $ tarnhost timeout uplink dvs9 uplink1 1 255
+  $ tarnhost timeout lag vswitch0 7 1
+  $ tarnhost timeout lag vswitch0 16 65
+  $ tarnhost timeout lag dvs9 7 255
+  $ : > trace
+
+The modifiers go to the library as given; absent ones as empty text and 0.
+
+  $ orvocfg-vswitch -O --portset=vswitch0 --lagid=0x10 --uplink=uplink1 &&
+  > orvocfg-vswitch -O -s vswitch0 -j 1 && orvocfg-vswitch -o &&
+  > orvocfg-vswitch -o -s vswitch0 -j abc -k uplink2; echo $?
+  vswitch0,uplink1,1,1
+  vswitch0,uplink1,16,65
+  vswitch0,uplink2,1,0
+  vswitch0,uplink2,1,0
+  0
+  $ calls '[A-Za-z]*TimeoutConfig'
+  LoadUplinkTimeoutConfig("vswitch0", 16, "uplink1")
+  LoadUplinkTimeoutConfig("vswitch0", 1, "")
+  GetUplinkTimeoutConfig("", 0, "")
+  GetUplinkTimeoutConfig("vswitch0", 0, "uplink2")
+  $ orvocfg-vswitch -O -s dvs9 && orvocfg-vswitch -o -s dvs9; echo $?
+  dvs9,uplink1,1,255
+  0
+
+LAG timeouts have an empty uplink column.
+
+  $ orvocfg-vswitch -g; echo $?
+  0
+  $ orvocfg-vswitch -G -j 7 && orvocfg-vswitch -G --lagid=020 -s vswitch0 &&
+  > orvocfg-vswitch -g; echo $?
+  dvs9,,7,255
+  vswitch0,,7,1
+  vswitch0,,16,65
+  0
+  $ calls '[A-Za-z]*TimeoutConfig'
+  LoadUplinkTimeoutConfig("dvs9", 0, "")
+  GetUplinkTimeoutConfig("dvs9", 0, "")
+  GetLagTimeoutConfig("", 0)
+  LoadLagTimeoutConfig("", 7)
+  LoadLagTimeoutConfig("vswitch0", 16)
+  GetLagTimeoutConfig("", 0)
+
+A failure prints the detailed message alone and nothing of the listing.
+
+  $ tarnhost fault add GetLagTimeoutConfig --detail 'lag table unreadable'
+  $ orvocfg-vswitch -g; echo "status $?"
+  lag table unreadable
+  status 1
+  $ tarnhost fault add LoadUplinkTimeoutConfig --detail 'uplink table locked'
+  $ orvocfg-vswitch -O; echo "status $?"
+  uplink table locked
+  status 1
