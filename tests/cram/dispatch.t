@@ -129,14 +129,3 @@ the name; with neither, the second lookup's failure is reported.
   $ orvocfg-vswitch -m 9000 nosuch
   dvs lookup failed
   [1]
-
--f signals the device manager before the portset is looked up: without the
-daemon the run ends there.
-
-  $ rm -f trace
-  $ orvocfg-vswitch -f nosuch
-  Failed to open /var/run/halden/tarndevmgr.pid
-  [1]
-  $ grep -c GetPortsetById trace
-  0
-  [1]
