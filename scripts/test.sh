@@ -1,8 +1,16 @@
 #!/usr/bin/env bash
-# Sets up, builds, and runs every test.
+# Sets up, builds, and runs every test: once on the normal build, then once
+# more on a build with AddressSanitizer and UndefinedBehaviorSanitizer.
 set -euo pipefail
 here=$(cd "$(dirname "$0")/.." && pwd)
 cd "$here"
 "$here/scripts/deps.sh"
+jobs=$(nproc)
+
 "$here/scripts/build.sh"
-ctest --test-dir build -j"$(nproc)" --output-on-failure
+ctest --test-dir build -j"$jobs" --output-on-failure
+
+export ASAN_OPTIONS=detect_leaks=1:abort_on_error=0
+export UBSAN_OPTIONS=print_stacktrace=1:halt_on_error=1
+BUILD_DIR=build-sanitize "$here/scripts/build.sh" -DORVO_SANITIZE=ON -DCMAKE_BUILD_TYPE=Debug
+ctest --test-dir build-sanitize -j"$jobs" --output-on-failure

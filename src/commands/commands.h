@@ -29,8 +29,7 @@ int SetPortgroupVlan(HostCtl::Network::VirtualSwitch& sw, std::string portGroup,
 
 // Uplinks and the teaming list edits they share.
 bool AddUplinkToTeaming(const std::string& uplink, HostCtl::Network::NicTeamingPolicy& policy);
-bool RemoveUplinkFromTeaming(const std::string& uplink,
-                             HostCtl::Network::NicTeamingPolicy& policy);
+bool RemoveUplinkFromTeaming(const std::string& uplink, HostCtl::Network::NicTeamingPolicy& policy);
 int LinkPnic(HostCtl::Network::VirtualSwitch& sw, std::string pnic);
 int UnlinkPnic(HostCtl::Network::VirtualSwitch& sw, std::string pnic);
 // May end the process with status 1.
@@ -63,8 +62,7 @@ void LoadUplinkTimeouts(HostCtl::Network::VirtualSwitchInfo& info,
                         const Cli::CommandOptions& options);
 void PrintUplinkTimeouts(HostCtl::Network::VirtualSwitchInfo& info,
                          const Cli::CommandOptions& options);
-void LoadLagTimeouts(HostCtl::Network::VirtualSwitchInfo& info,
-                     const Cli::CommandOptions& options);
+void LoadLagTimeouts(HostCtl::Network::VirtualSwitchInfo& info, const Cli::CommandOptions& options);
 void PrintLagTimeouts(HostCtl::Network::VirtualSwitchInfo& info,
                       const Cli::CommandOptions& options);
 

@@ -146,8 +146,8 @@ class VirtualSwitchInfo : public virtual Refreshable {
   virtual void LoadUplinkTimeoutConfig(const std::string& portset, uint32_t lagId,
                                        const std::string& uplink) = 0;
   virtual std::vector<UplinkTimeoutConfig> GetUplinkTimeoutConfig(const std::string& portset,
-                                                                   uint32_t lagId,
-                                                                   const std::string& uplink) = 0;
+                                                                  uint32_t lagId,
+                                                                  const std::string& uplink) = 0;
   virtual void LoadLagTimeoutConfig(const std::string& portset, uint32_t lagId) = 0;
   virtual std::vector<LagTimeoutConfig> GetLagTimeoutConfig(const std::string& portset,
                                                             uint32_t lagId) = 0;

@@ -36,7 +36,6 @@ enum : int {
 extern const NODI_NodeId NODI_NODE_net_ens_activate;
 
 int NODI_CheckSig(NODI_SigResult* result, int version, uint32_t* info);
-int NODI_Set(NODI_NodeId node, int instance, NODI_ParamList* params, int reserved1,
-             int reserved2);
+int NODI_Set(NODI_NodeId node, int instance, NODI_ParamList* params, int reserved1, int reserved2);
 void NODI_ParamListDestroy(NODI_ParamList* params);
 const char* TARN_ReturnStatusToString(int status);

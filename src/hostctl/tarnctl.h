@@ -56,12 +56,9 @@ class VirtualSwitchInfoImpl : public HostCtl::Network::VirtualSwitchInfo {
       const HostCtl::Network::ShapingPolicy& shaping,
       const HostCtl::Network::NicCapabilities& capabilities, const std::string& name,
       int32_t numPorts) override;
-  std::unique_ptr<HostCtl::Network::DVSwitch> AddDVSwitch(const std::string& uuid,
-                                                          const std::string& switchName,
-                                                          const std::string& implClass,
-                                                          const std::string& portsetName,
-                                                          int32_t numPorts, int32_t version,
-                                                          int reserved) override;
+  std::unique_ptr<HostCtl::Network::DVSwitch> AddDVSwitch(
+      const std::string& uuid, const std::string& switchName, const std::string& implClass,
+      const std::string& portsetName, int32_t numPorts, int32_t version, int reserved) override;
   void RemoveVirtualSwitch(const std::string& name) override;
   std::vector<std::unique_ptr<HostCtl::Network::VirtualSwitch>> GetVirtualSwitches(
       bool system) override;

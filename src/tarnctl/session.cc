@@ -137,7 +137,7 @@ std::shared_ptr<Session> Session::Current() {
 std::shared_ptr<Session> Session::Acquire() {
   if (auto current = Current()) return current;
   Shared& shared = Process();
-  if (shared.owner != getpid()) {
+  if (shared.owner != 0 && shared.owner != getpid()) {
     // A forked child's copy of its parent's session stays untouched: its
     // connection and lock belong to the parent.
     new std::weak_ptr<Session>(std::move(shared.session));

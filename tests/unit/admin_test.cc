@@ -7,9 +7,9 @@
 #include <functional>
 #include <string>
 
+#include "host_fixture.h"
 #include "hostctl/exception.h"
 #include "tarnctl/admin.h"
-#include "host_fixture.h"
 
 namespace {
 
