@@ -22,13 +22,13 @@ Args::Args(const std::vector<std::string>& words, const std::vector<OptionSpec>&
     if (word.compare(0, 2, "--") != 0) throw UsageError("unknown option " + word);
     const auto eq = word.find('=');
     const std::string name = word.substr(2, eq == std::string::npos ? std::string::npos : eq - 2);
-    const OptionSpec* option = nullptr;
+    const OptionSpec* known = nullptr;
     for (const auto& o : options) {
-      if (name == o.name) option = &o;
+      if (name == o.name) known = &o;
     }
-    if (!option) throw UsageError("unknown option --" + name);
+    if (!known) throw UsageError("unknown option --" + name);
     std::string value;
-    if (option->takesValue) {
+    if (known->takesValue) {
       if (eq != std::string::npos) {
         value = word.substr(eq + 1);
       } else if (i + 1 < words.size()) {
@@ -40,7 +40,7 @@ Args::Args(const std::vector<std::string>& words, const std::vector<OptionSpec>&
       throw UsageError("option --" + name + " takes no value");
     }
     auto& slot = values_[name];
-    if (!slot.empty() && !option->repeatable) throw UsageError("option --" + name + " given twice");
+    if (!slot.empty() && !known->repeatable) throw UsageError("option --" + name + " given twice");
     slot.push_back(value);
   }
   if (positional_.size() < minPositional) throw UsageError("missing arguments");
