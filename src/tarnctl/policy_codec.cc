@@ -21,7 +21,8 @@ namespace {
 // The unsigned member `key` of `object`, no larger than `max`.
 uint64_t Unsigned(const Json& object, const char* key, uint64_t max, const std::string& text) {
   const auto found = object.find(key);
-  if (found == object.end() || !found->is_number_unsigned()) Malformed("teaming policy", text);
+  if (found == object.end()) return 0;
+  if (!found->is_number_unsigned()) Malformed("teaming policy", text);
   const uint64_t value = found->get<uint64_t>();
   if (value > max) Malformed("teaming policy", text);
   return value;
@@ -56,18 +57,20 @@ std::vector<std::string> Names(const Json& json, const std::string& what, const 
 }  // namespace
 
 std::string EncodeTeamingPolicy(const NicTeamingPolicy& policy) {
-  Json criteria;
-  criteria["checkMask"] = policy.linkCriteria.checkMask;
-  criteria["minSpeed"] = policy.linkCriteria.minSpeed;
-  criteria["errorPercent"] = policy.linkCriteria.errorPercent;
-  criteria["fullDuplex"] = policy.linkCriteria.fullDuplex;
-  Json json;
-  json["flags"] = policy.flags;
-  json["balancing"] = policy.balancing;
-  json["failback"] = policy.failback;
-  json["linkCriteria"] = criteria;
-  json["uplinkOrder"] = policy.uplinkOrder;
-  json["maxActive"] = policy.maxActive;
+  // Fields at their zero value are left out: most port groups carry the
+  // empty policy, and short rows keep the port group table shallow.
+  Json criteria = Json::object();
+  if (policy.linkCriteria.checkMask) criteria["checkMask"] = policy.linkCriteria.checkMask;
+  if (policy.linkCriteria.minSpeed) criteria["minSpeed"] = policy.linkCriteria.minSpeed;
+  if (policy.linkCriteria.errorPercent) criteria["errorPercent"] = policy.linkCriteria.errorPercent;
+  if (policy.linkCriteria.fullDuplex) criteria["fullDuplex"] = policy.linkCriteria.fullDuplex;
+  Json json = Json::object();
+  if (policy.flags) json["flags"] = policy.flags;
+  if (policy.balancing) json["balancing"] = policy.balancing;
+  if (policy.failback) json["failback"] = policy.failback;
+  if (!criteria.empty()) json["linkCriteria"] = criteria;
+  if (!policy.uplinkOrder.empty()) json["uplinkOrder"] = policy.uplinkOrder;
+  if (policy.maxActive) json["maxActive"] = policy.maxActive;
   return Dump(json);
 }
 
@@ -80,8 +83,10 @@ NicTeamingPolicy DecodeTeamingPolicy(const std::string& text) {
       Unsigned(json, "balancing", std::numeric_limits<uint16_t>::max(), text));
   policy.failback =
       static_cast<uint8_t>(Unsigned(json, "failback", std::numeric_limits<uint8_t>::max(), text));
-  const auto criteria = json.find("linkCriteria");
-  if (criteria == json.end() || !criteria->is_object()) Malformed("teaming policy", text);
+  const auto found = json.find("linkCriteria");
+  const Json none = Json::object();
+  const Json* criteria = found == json.end() ? &none : &*found;
+  if (!criteria->is_object()) Malformed("teaming policy", text);
   policy.linkCriteria.checkMask =
       Unsigned(*criteria, "checkMask", std::numeric_limits<uint64_t>::max(), text);
   policy.linkCriteria.minSpeed =
@@ -90,13 +95,12 @@ NicTeamingPolicy DecodeTeamingPolicy(const std::string& text) {
       Unsigned(*criteria, "errorPercent", std::numeric_limits<uint32_t>::max(), text));
   policy.linkCriteria.fullDuplex = static_cast<uint8_t>(
       Unsigned(*criteria, "fullDuplex", std::numeric_limits<uint8_t>::max(), text));
-  const auto order = json.find("uplinkOrder");
-  if (order == json.end()) Malformed("teaming policy", text);
-  policy.uplinkOrder = Names(*order, "teaming policy", text);
-  const auto maxActive = json.find("maxActive");
-  if (maxActive == json.end() || !maxActive->is_number_integer()) {
-    Malformed("teaming policy", text);
+  if (const auto order = json.find("uplinkOrder"); order != json.end()) {
+    policy.uplinkOrder = Names(*order, "teaming policy", text);
   }
+  const auto maxActive = json.find("maxActive");
+  if (maxActive == json.end()) return policy;
+  if (!maxActive->is_number_integer()) Malformed("teaming policy", text);
   const int64_t active = maxActive->get<int64_t>();
   if (active < std::numeric_limits<int32_t>::min() ||
       active > std::numeric_limits<int32_t>::max()) {

@@ -1,9 +1,9 @@
-// The stored form of a teaming policy: a JSON object with every field of
-// the record, e.g.
-//   {"flags":16,"balancing":0,"failback":0,
-//    "linkCriteria":{"checkMask":0,"minSpeed":0,"errorPercent":0,"fullDuplex":0},
-//    "uplinkOrder":["pnic0"],"maxActive":1}
-// Decoding refuses (HostCtlException) text that is not such an object.
+// The stored form of a teaming policy: a JSON object with the fields of the
+// record that are not zero (or empty), e.g.
+//   {"flags":16,"uplinkOrder":["pnic0"],"maxActive":1}
+// and {} for the empty policy of a new port group; "linkCriteria" is an
+// object of the same kind. Missing fields decode as zero. Decoding refuses
+// (HostCtlException) text that is not such an object.
 //
 // A list of names (the uplinks of an opaque switch) is stored as a JSON
 // array of strings, e.g. ["pnic2","pnic3"].
