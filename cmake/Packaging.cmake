@@ -68,8 +68,8 @@ set(CPACK_DEBIAN_PACKAGE_MAINTAINER "orvocfg-vswitch developers <dev@orvocfg.inv
 set(CPACK_DEBIAN_PACKAGE_ARCHITECTURE amd64)
 set(CPACK_DEBIAN_PACKAGE_SECTION admin)
 set(CPACK_DEBIAN_PACKAGE_PRIORITY optional)
-# dpkg-shlibdeps (dpkg-dev) finds the shared libraries the programs need,
-# libsqlite3-0 among them.
+# dpkg-shlibdeps (dpkg-dev) finds the shared libraries the programs need
+# (with ORVO_STATIC_RUNTIME off, libsqlite3-0 and the C++ runtime too).
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
