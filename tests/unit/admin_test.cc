@@ -13,11 +13,8 @@
 
 namespace {
 
-using HostCtl::Lib::HostCtlException;
 using TarnCtl::Admin::Host;
 
-// Each test gets a host database of its own (HostTest), and may switch to
-// another file beside it.
 class AdminTest : public HostTest {
  protected:
   void UseDatabase(const std::string& name) {
@@ -52,8 +49,7 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
     shown = host.Show();
   }
   ASSERT_EQ(dumped.back(), '\n');
-  for (const char* part : {"\"format\": \"tarnhost-dump\"", "\"version\": 1", "\"hex\":",
-                           "\"uplinkOrder\": [\n", "\"target\": null", "\"name\": \"sys0\""}) {
+  for (const char* part : {"\"hex\":", "\"uplinkOrder\": [\n", "\"target\": null"}) {
     EXPECT_NE(dumped.find(part), std::string::npos) << part;
   }
   // Into an emptied host, and into a brand-new file.
@@ -67,75 +63,35 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
   }
 }
 
+// The refusals the tarnhost transcript does not already show.
 TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
   const std::string tooLong(32, 'x');
+  auto dvs = [](TarnCtl::Admin::DVSwitchSeed seed) {
+    return [seed](Host& h) { h.AddDVSwitch(seed); };
+  };
   const struct {
     const char* what;
     std::function<void(Host&)> call;
     const char* message;
   } cases[] = {
-      {"pnic twice", [](Host& h) { h.AddPnic("pnic0"); }, "Pnic pnic0 already exists"},
       {"pnic empty", [](Host& h) { h.AddPnic(""); }, "Pnic name is empty"},
       {"pnic long", [&](Host& h) { h.AddPnic(tooLong); }, "is too long"},
-      {"client unknown pg", [](Host& h) { h.AddClient("nosuch", "vm"); },
-       "Portgroup nosuch does not exist"},
       {"client twice", [](Host& h) { h.AddClient("Management", "vm1"); },
        "Client vm1 is already on portgroup Management"},
       {"client unnamed", [](Host& h) { h.AddClient("Management", ""); }, "Client name is empty"},
-      {"system switch name taken", [](Host& h) { h.AddSystemSwitch("vswitch0", 64); },
-       "vswitch0 already exists"},
-      {"system switch name taken by a portset", [](Host& h) { h.AddSystemSwitch("ps0", 64); },
-       "ps0 already exists"},
-      {"system switch ports low", [](Host& h) { h.AddSystemSwitch("s", 7); },
-       "Invalid number of ports 7"},
-      {"system switch ports high", [](Host& h) { h.AddSystemSwitch("s", 4097); },
-       "Invalid number of ports 4097"},
+      {"name of a portset", [](Host& h) { h.AddSystemSwitch("ps0", 64); }, "ps0 already exists"},
+      {"ports low", [](Host& h) { h.AddSystemSwitch("s", 7); }, "Invalid number of ports 7"},
       {"system switch long name", [&](Host& h) { h.AddSystemSwitch(tooLong, 64); }, "is too long"},
-      {"dvs pnic taken by vswitch",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic0"}});
-       },
-       "pnic0 is already linked to vswitch0"},
-      {"dvs pnic taken by dvs",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic1"}});
-       },
+      {"pnic of a dvs", dvs({"d", {}, {}, 128, 1500, {"pnic1"}}),
        "pnic1 is already linked to dvs0"},
-      {"dvs pnic taken by opaque",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic3"}});
-       },
+      {"pnic of opaque", dvs({"d", {}, {}, 128, 1500, {"pnic3"}}),
        "pnic3 is already linked to opq0"},
-      {"dvs unknown pnic",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic9"}});
-       },
-       "Uplink pnic9 does not exist"},
-      {"dvs pnic twice",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}});
-       },
+      {"pnic twice", dvs({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}}),
        "Uplink pnic4 is given twice"},
-      {"dvs mtu",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, {}, 128, 9001, {}});
-       },
-       "MTU 9001 is out of range"},
-      {"dvs id taken",
-       [](Host& h) {
-         h.AddDVSwitch({"d", {}, "dvs-dvs0", 128, 1500, {}});
-       },
+      {"dvs mtu", dvs({"d", {}, {}, 128, 9001, {}}), "MTU 9001 is out of range"},
+      {"dvs id taken", dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
        "Switch id dvs-dvs0 is already in use"},
-      {"dvs name taken",
-       [](Host& h) {
-         h.AddDVSwitch({"dvs0", "p9", {}, 128, 1500, {}});
-       },
-       "dvs0 already exists"},
-      {"dvport unknown dvs",
-       [](Host& h) {
-         h.AddDVPort({"nosuch", "1", {}, 0});
-       },
-       "DVS nosuch does not exist"},
+      {"dvs name taken", dvs({"dvs0", "p9", {}, 128, 1500, {}}), "dvs0 already exists"},
       {"dvport twice",
        [](Host& h) {
          h.AddDVPort({"dvs0", "100", {}, 0});
@@ -146,28 +102,11 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
          h.AddDVPort({"dvs0", "7", {"a", "a"}, 0});
        },
        "Client a is given twice"},
-      {"opaque used beyond ports",
-       [](Host& h) {
-         h.AddOpaqueSwitch({"o", {}, 16, 17, {}});
-       },
-       "used ports 17"},
-      {"uplink timeout high", [](Host& h) { h.AddUplinkTimeout("vs0", "u", 1, 256); },
-       "Invalid timeout 256"},
       {"uplink timeout twice", [](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
        "already stored"},
       {"lag timeout twice", [](Host& h) { h.AddLagTimeout("dvs0", 3, 1); }, "already stored"},
       {"lag timeout unnamed portset", [](Host& h) { h.AddLagTimeout("", 3, 1); },
        "Portset name is empty"},
-      {"fault without operation",
-       [](Host& h) {
-         h.AddFault({"", {}, {}, {}, 0, 1});
-       },
-       "Fault operation is empty"},
-      {"fault never failing",
-       [](Host& h) {
-         h.AddFault({"GetName", {}, {}, {}, 0, 0});
-       },
-       "Invalid times 0"},
       {"fault negative skip",
        [](Host& h) {
          h.AddFault({"GetName", {}, {}, {}, -1, 1});
@@ -178,14 +117,9 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
   Seed(host);
   const std::string before = host.Dump();
   for (const auto& c : cases) {
-    try {
-      c.call(host);
-      ADD_FAILURE() << c.what << ": not refused";
-    } catch (const HostCtlException& e) {
-      EXPECT_NE(e.GetMessage().find(c.message), std::string::npos)
-          << c.what << ": " << e.GetMessage();
-      EXPECT_EQ(e.GetDetailedMessage().rfind("Add", 0), 0u) << c.what;
-    }
+    const auto [message, detail] = Refused([&] { c.call(host); });
+    EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
+    EXPECT_EQ(detail.rfind("Add", 0), 0u) << c.what;
     EXPECT_EQ(host.Dump(), before) << c.what;
   }
 }
@@ -196,12 +130,10 @@ TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {
   host.AddDVSwitch({"x", "dvs-dvs0", {}, 128, 1500, {}});
   host.AddSystemSwitch("sys0", 64);
   const std::string dump = host.Dump();
-  // Ids derived from the name stay unique; the UUID text is the name's bytes.
+  // An id derived from the name (never the portset) stays unique.
   EXPECT_NE(dump.find("\"switch_id\": \"dvs-dvs0\""), std::string::npos);
   EXPECT_NE(dump.find("\"switch_id\": \"dvs-x\""), std::string::npos);
-  EXPECT_NE(dump.find("\"uuid\": \"64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00\""),
-            std::string::npos);
-  // Both layers hold the system switch, with an explicit empty order.
+  // Both layers hold the system switch.
   size_t at = 0;
   int copies = 0;
   while ((at = dump.find("\"name\": \"sys0\"", at)) != std::string::npos) ++copies, ++at;
@@ -231,10 +163,8 @@ TEST_F(AdminTest, LoadRefusesFaultyDumpsAndKeepsTheHost) {
     std::string text;
     const char* message;
   } cases[] = {
-      {"not JSON", "{\"format\": ", "not valid JSON"},
       {"trailing text", good + "x", "not valid JSON"},
       {"array", "[]", "a dump is a JSON object"},
-      {"version unknown", replaced("\"version\": 1", "\"version\": 2"), "unsupported version 2"},
       {"version as text", replaced("\"version\": 1", "\"version\": \"1\""), "must be an integer"},
       {"version missing", replaced("\"version\": 1,", ""), "\"version\" must come before"},
       {"format wrong", replaced("tarnhost-dump", "other"), "\"format\" must be"},
@@ -272,13 +202,8 @@ TEST_F(AdminTest, LoadRefusesFaultyDumpsAndKeepsTheHost) {
       {"counter not a number", counterAt("x"), "\"next_seq\" is not a number"},
   };
   for (const auto& c : cases) {
-    try {
-      host.Load(c.text);
-      ADD_FAILURE() << c.what << ": accepted";
-    } catch (const HostCtlException& e) {
-      EXPECT_NE(e.GetMessage().find(c.message), std::string::npos)
-          << c.what << ": " << e.GetMessage();
-    }
+    const std::string message = Refusal([&] { host.Load(c.text); });
+    EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
     EXPECT_EQ(host.Dump(), good) << c.what;
   }
 }

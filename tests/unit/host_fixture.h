@@ -12,6 +12,7 @@
 #include <functional>
 #include <sstream>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "hostctl/exception.h"
@@ -74,16 +75,30 @@ class HostTest : public ::testing::Test {
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   }
 
-  // The message of the HostCtlException that `body` throws ("" when none).
+  // The message and the detailed message of the HostCtlException that
+  // `body` throws (both "" when none).
   template <typename Body>
-  static std::string Refusal(Body body) {
+  static std::pair<std::string, std::string> Refused(Body body) {
     try {
       body();
     } catch (const HostCtl::Lib::HostCtlException& e) {
-      return e.GetMessage();
+      return {e.GetMessage(), e.GetDetailedMessage()};
     }
-    return "";
+    return {};
   }
+  template <typename Body>
+  static std::string Refusal(Body body) {
+    return Refused(body).first;
+  }
+
+  static std::unique_ptr<HostCtl::Network::VirtualSwitch> Switch(const std::string& name) {
+    return HostCtl::Network::NetworkFactory::GetVirtualSwitchById(
+        name, HostCtl::Network::PORTSET_GET_DEFAULT);
+  }
+  static std::unique_ptr<HostCtl::Network::DVSwitch> Dvs(const std::string& name) {
+    return HostCtl::Network::NetworkFactory::GetDVSwitchByName(name);
+  }
+  static void Reboot() { TarnCtl::Admin::Host().Reboot(); }
 
   // The sample host: the default host (vswitch0 on pnic0, port group
   // Management) plus
