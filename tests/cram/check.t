@@ -19,8 +19,7 @@ A distributed switch answers the lookup; SwitchExists is not asked then.
   $ grep -c 'SwitchExists("vswitch9")' trace
   1
 
--C looks through the port groups of every switch, by exact name, and
-ignores any operand.
+-C looks through every switch's port groups by exact name, ignoring operands.
 
   $ orvocfg-vswitch -a sw1 && orvocfg-vswitch -A Guests sw1
   $ orvocfg-vswitch -C Guests; orvocfg-vswitch -C Management vswitch9; orvocfg-vswitch -C management

@@ -4,11 +4,8 @@ Argument checks and the dispatch chain of orvocfg-vswitch.
   $ tarnhost init
   $ export TARN_TRACE=$PWD/trace
 
-Usage errors before anything is looked at: no option, and ENS switched on and
-off at once (even behind a command option). The host is not touched.
+Usage errors (no option; ENS on and off at once) leave the host untouched.
 
-  $ orvocfg-vswitch | head -1
-  orvocfg-vswitch [options] [vswitch[:ports]]
   $ orvocfg-vswitch > /dev/null
   [1]
   $ orvocfg-vswitch -y -Y vswitch0 > /dev/null
@@ -20,27 +17,13 @@ off at once (even behind a command option). The host is not touched.
 
 Missing arguments, each its own line and status 1.
 
-  $ orvocfg-vswitch -a
-  No virtual switch name specified
-  [1]
-  $ orvocfg-vswitch -a -Z
-  No virtual switch name specified
-  [1]
-  $ orvocfg-vswitch -v 10 vswitch0
-  No portgroup name specified. Specify with -p option
-  [1]
-  $ orvocfg-vswitch -M pnic1 vswitch0
-  No portgroup name specified. Specify with -p option
-  [1]
-  $ orvocfg-vswitch -P pnic1 dvs0
-  No DVPort ID specified. Specify with -V option
-  [1]
-  $ orvocfg-vswitch -T dvs0
-  No DVPort ID specified. Specify with -V option
-  [1]
+  $ for a in -a '-a -Z' '-v 10 vswitch0' '-M pnic1 vswitch0' '-P pnic1 dvs0' '-T dvs0'; do
+  >   orvocfg-vswitch $a 2>&1; echo "status $?"; done | paste -d' ' - - | uniq -c
+        2 No virtual switch name specified status 1
+        2 No portgroup name specified. Specify with -p option status 1
+        2 No DVPort ID specified. Specify with -V option status 1
 
-Names of 32 characters or more are refused, except for the DVPort uplink
-commands, which hand the name to the lookup.
+Names of 32 characters or more are refused, but for the DVPort uplink commands.
 
   $ long=abcdefghijklmnopqrstuvwxyz012345
   $ orvocfg-vswitch -a $long
@@ -56,8 +39,7 @@ commands, which hand the name to the lookup.
   $ grep -c "GetDVSwitchByName(\"$long\")" trace
   1
 
-The port count follows the first ":" only with -a; elsewhere the colon is
-part of the name.
+The port count follows the first ":" only with -a; elsewhere it is in the name.
 
   $ rm trace
   $ orvocfg-vswitch -a sw1:0x40 && orvocfg-vswitch -a sw4:010 && orvocfg-vswitch -a sw5
@@ -75,8 +57,7 @@ part of the name.
   Not a valid virtual switch or it is a DVSwitch: sw1:64
   [1]
 
---ens-ready sets the node and ends the run before any switch object exists,
-whatever else was asked.
+--ens-ready sets the node and ends the run with 0, whatever else was asked.
 
   $ rm trace
   $ orvocfg-vswitch -a -Z sw9
@@ -92,31 +73,25 @@ Modifiers alone take no step; -l ignores its operand.
   $ orvocfg-vswitch -l nosuch -S
   [1]
 
-A lookup that finds nothing reaches the run-wide handler: the detailed
-message alone, status 1.
+A lookup that finds nothing: the run-wide handler's detailed message alone.
 
   $ tarnhost fault add GetVirtualSwitchById --on nosuch --message short --detail 'nosuch: no such switch'
   $ orvocfg-vswitch -L pnic1 nosuch
   nosuch: no such switch
   [1]
 
-ENS options run after the command in the same run; the status is the
-command's. A failed add still lets ENS be activated on the existing switch.
+ENS options run after the command, even a failed one; the status is the command's.
 
   $ rm trace
-  $ orvocfg-vswitch -a -y vs1
-  $ grep -o -e '^AddVirtualSwitch.*"vs1", 128)$' -e '^GetPortsetById.*' -e '^ActivateEns.*' trace | sed 's/(.*"vs1", 128)/(... "vs1", 128)/'
-  AddVirtualSwitch(... "vs1", 128)
-  GetPortsetById("vs1")
-  ActivateEns(false, false) on vs1
-  $ orvocfg-vswitch -a -y -i vs1
-  Failed to add vswitch: vs1, Error: Virtual switch vs1 already exists
+  $ orvocfg-vswitch -a -y -i vswitch0
+  Failed to add vswitch: vswitch0, Error: Virtual switch vswitch0 already exists
   [1]
-  $ grep -c 'ActivateEns(true, false) on vs1' trace
-  1
+  $ grep -e '^GetPortsetById' -e '^ActivateEns' trace
+  GetPortsetById("vswitch0")
+  ActivateEns(true, false) on vswitch0
 
--m falls back to the distributed switch silently when no standard switch has
-the name; with neither, the second lookup's failure is reported.
+-m falls back silently to a distributed switch; with neither, the second
+lookup's failure is reported.
 
   $ tarnhost dvs add dvs0
   $ rm trace

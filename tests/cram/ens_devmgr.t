@@ -1,5 +1,5 @@
-Forced reassociation signals the device manager named by its PID file. The
-path is fixed, so this test owns it while it runs and leaves nothing behind.
+Forced reassociation signals the device manager named by its fixed PID file,
+which this test owns while it runs and leaves nothing behind.
 
   $ . "$TESTDIR/setup.sh"
   $ export TARN_TRACE=$PWD/trace
@@ -23,43 +23,28 @@ No PID file: the message goes to standard output and nothing is reassociated.
   $ calls ReassociateEnsUplinks
   [1]
 
-A PID file that names no single process is refused the same way: 0, no
-number, beyond the largest pid, negative as a pid.
+A PID file naming no single process (0, no number, too large, negative):
 
   $ for text in 0 '' abc 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648; do
   >   printf '%s\n' "$text" > "$pidfile"
   >   orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
-  > done
-  Failed to read device manager PID
-  status 1
-  Failed to read device manager PID
-  status 1
-  Failed to read device manager PID
-  status 1
-  Failed to read device manager PID
-  status 1
-  Failed to read device manager PID
-  status 1
-  Failed to read device manager PID
-  status 1
+  > done | paste -d' ' - - | uniq -c
+        6 Failed to read device manager PID status 1
   $ calls ReassociateEnsUplinks
   [1]
 
 -z does not read the file.
 
-  $ orvocfg-vswitch -z vswitch0; echo $?
-  0
+  $ orvocfg-vswitch -z vswitch0
   $ calls ReassociateEnsUplinks
   ReassociateEnsUplinks(false, false, 0, 0) on vswitch0
 
-A valid PID (white space before it is skipped) gets the hang-up signal, and
-the reassociation is forced.
+A valid PID (after white space) gets SIGHUP, and the reassociation is forced.
 
   $ (sleep 30 & echo $! > sleeper; wait $!; echo "sleep ended with $?" > ended) 2>/dev/null &
   $ until [ -s sleeper ]; do sleep 0.1; done; pid=$(cat sleeper)
   $ printf ' \n  %s\n' "$pid" > "$pidfile"
-  $ orvocfg-vswitch -f vswitch0; echo $?
-  0
+  $ orvocfg-vswitch -f vswitch0
   $ wait; pid=; cat ended
   sleep ended with 129
   $ calls ReassociateEnsUplinks

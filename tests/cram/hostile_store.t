@@ -1,41 +1,35 @@
-A host file that is not a usable host database is refused with one line
-naming the file and the cause, status 1, and the file is left as it was.
+A host file that is not a usable host database: one line naming the file and
+the cause, status 1, the file left as it was.
 
   $ . "$TESTDIR/setup.sh"
-  $ try() { local f=$1; shift; local before=$(sha256sum < "$f"); orvocfg-vswitch "$@" > out 2> err; echo "status $?, $(wc -l < err) line(s)"; sed "s|$PWD|PWD|" err; cat out; [ "$(sha256sum < "$f")" = "$before" ] && echo unchanged; }
+  $ try() { local f=$1; shift; local before=$(sha256sum < "$f"); orvocfg-vswitch "$@" > out 2> err; local st=$?; [ "$(sha256sum < "$f")" = "$before" ] && st="$st, unchanged"; echo "status $st, $(wc -l < err) line(s):"; sed "s|$PWD|PWD|" err; cat out; }
 
-Another application's database, a newer schema, text, an empty file and a
-truncated host:
+Another application's database, a newer schema, text, empty, truncated:
 
   $ sqlite3 other.db 'CREATE TABLE x(a); INSERT INTO x VALUES (1)'
   $ TARN_HOST_DB=$PWD/other.db try other.db -A pg1 vswitch0
-  status 1, 1 line(s)
+  status 1, unchanged, 1 line(s):
   Cannot open host database PWD/other.db: not a host database (application id 0x0)
-  unchanged
 
   $ tarnhost init && cp host.db newer.db && sqlite3 newer.db 'PRAGMA user_version=2'
   $ TARN_HOST_DB=$PWD/newer.db try newer.db -a vs1
-  status 1, 1 line(s)
+  status 1, unchanged, 1 line(s):
   Cannot open host database PWD/newer.db: schema version 2 is newer than this library's 1
-  unchanged
 
   $ printf 'not a database %.0s' $(seq 300) > text.db
   $ TARN_HOST_DB=$PWD/text.db try text.db -l
-  status 1, 1 line(s)
+  status 1, unchanged, 1 line(s):
   Cannot open host database PWD/text.db: file is not a database
-  unchanged
 
   $ : > empty.db
   $ TARN_HOST_DB=$PWD/empty.db try empty.db -c vswitch0
-  status 1, 1 line(s)
+  status 1, unchanged, 1 line(s):
   Cannot open host database PWD/empty.db: not a host database (empty file)
-  unchanged
 
   $ cp host.db cut.db && truncate -s 4096 cut.db
   $ TARN_HOST_DB=$PWD/cut.db try cut.db -L pnic1 vswitch0
-  status 1, 1 line(s)
+  status 1, unchanged, 1 line(s):
   Cannot open host database PWD/cut.db: database disk image is malformed
-  unchanged
 
 tarnhost refuses them the same way and does not replace them on init:
 

@@ -1,12 +1,9 @@
-The -l tables: standard switches with their port groups, distributed switches
-with their DVPorts, opaque switches. Fields are fixed-width, left-aligned,
-padded and never cut; "$" marks the line ends.
+The -l tables: fixed-width fields, padded and never cut; "$" marks line ends.
 
   $ . "$TESTDIR/setup.sh"
   $ vs() { orvocfg-vswitch "$@" vswitch0; }
 
-A standard switch with two links and three clients. The simulated host
-configures every port of a switch, so Configured Ports equals Num Ports.
+A standard switch with two links and three clients (all ports configured).
 
   $ tarnhost init --empty && tarnhost pnic add pnic0 && tarnhost pnic add pnic1
   $ vs -a vswitch0:1536 && vs -L pnic0 && vs -L pnic1 && vs -A Management && vs -A Guests
@@ -21,8 +18,7 @@ configures every port of a switch, so Configured Ports equals Num Ports.
     Guests                                    100      2                     $
   $
 
-A failing port group costs its row: the fields printed so far stay, the error
-line follows, and the listing goes on (here with the closing empty line).
+A failing port group: its fields so far, the error line, and the listing goes on.
 
   $ tarnhost fault add GetVlanId --on Management --message 'vlan unreadable'
   $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/' | sed -n 4,7p
@@ -31,8 +27,7 @@ line follows, and the listing goes on (here with the closing empty line).
     Guests                                    100      2                     $
   $
 
-When the port group's name cannot be fetched again for its error line, the
-switch's block ends with the switch's error line on the same line.
+A port group name lost for its error line ends the block with the switch's error.
 
   $ tarnhost fault add GetVlanId --on Guests --message 'vlan unreadable'
   $ tarnhost fault add GetName --on Guests --skip 1 --message 'name unreadable'
@@ -45,8 +40,7 @@ switch's block ends with the switch's error line on the same line.
     Management                                0        1           pnic1,pnic0$
     Guests                                    Listing failed for portgroup: Listing failed for vswitch: vswitch0, Error: name unreadable$
 
-A failing switch value ends the block after the fields printed so far; a
-failing name inside the switch's error line reaches the run-wide handler.
+A failing switch value ends the block; a name lost for its error line is fatal.
 
   $ tarnhost fault add GetMTU --on vswitch0 --message 'mtu unreadable'
   $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/'
@@ -58,8 +52,7 @@ failing name inside the switch's error line reaches the run-wide handler.
   1
   vswitch0         1536        5           1536              Listing failed for vswitch: name lost in detail
 
-A distributed switch whose portset name differs from its switch name: the
-row shows the switch name, error lines the portset name.
+A distributed switch: rows show the switch name, error lines the portset name.
 
   $ tarnhost init --empty && tarnhost pnic add pnic0
   $ tarnhost dvs add dvs0 --portset ps-dvs0 --ports 1024 --mtu 9000 --uplinks pnic0
@@ -81,8 +74,7 @@ row shows the switch name, error lines the portset name.
     101                                     Listing failed for DVPort: 101 under DVSwitch: ps-dvs0, Error: port unreadable$
     102                                     0           $
 
-The port parameters are asked for after the DVPort header and dropped; their
-failure ends the block.
+The port parameters are read after the DVPort header; their failure ends the block.
 
   $ TARN_TRACE=$PWD/trace orvocfg-vswitch -l > /dev/null
   $ grep -A1 GetDVPortParams trace
@@ -111,8 +103,7 @@ Opaque switches: one row, failures end the block.
   opaque0          512         Listing failed for opaque switch: ps-op0, Error: count unreadable$
   Switch Name      Num Ports   Used Ports  Uplinks   $
 
-Order of the blocks and the status: standard, distributed, opaque; -S lists
-only the system switches. Names longer than their field push the row.
+Block order, -S for system switches only, long names pushing the row, status.
 
   $ tarnhost init --empty && tarnhost system-switch add sys0 --ports 32
   $ orvocfg-vswitch -l; echo $?

@@ -25,8 +25,7 @@ Refusals by the library.
   Failed to remove portgroup: pg1, Error: in use
   [1]
 
--v sets one port group, or all of them with ALL; a refusal on one is
-reported and the others are still set.
+-v sets one port group, or all with ALL: a refusal on one, the others still set.
 
   $ orvocfg-vswitch -v 0x10 -p pg1 vswitch0
   $ tarnhost fault add SetVlanId --on pg1 --message 'vlan refused'
@@ -45,8 +44,7 @@ ALL on a switch without port groups is silent.
 
   $ orvocfg-vswitch -a empty && orvocfg-vswitch -v 5 -p ALL empty
 
-The port group list and the names read during the walk are not the
-command's to handle.
+Failures reading the port group list or names are fatal.
 
   $ tarnhost fault add GetPortGroups --detail 'port groups unreadable'
   $ orvocfg-vswitch -v 5 -p pg2 vswitch0

@@ -1,5 +1,4 @@
-Restore: switches from the stored configuration and the distributed switch
-cache (-r), and the uplinks of every standard switch (-R).
+Restore: switches (-r), and the uplinks of every standard switch (-R).
 
   $ . "$TESTDIR/setup.sh"
   $ export TARN_TRACE=$PWD/trace
@@ -13,41 +12,19 @@ A configured host comes back exactly as it was after a reboot and -r, -R.
   > orvocfg-vswitch -L pnic1 vs1 && orvocfg-vswitch -L pnic2 vs1 && orvocfg-vswitch -L pnic3 vs2 &&
   > orvocfg-vswitch -M pnic2 -p pgA vs1 && orvocfg-vswitch -M pnic1 -p pgA vs1 &&
   > orvocfg-vswitch -m 9000 vs1 && orvocfg-vswitch -a --dvswitch dvs0:32 &&
-  > orvocfg-vswitch -m 1600 dvs0; echo $?
-  0
-  $ orvocfg-vswitch -l > before; echo $?
-  0
-  $ cat before
-  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
-  vswitch0         128         1           128               1500    pnic0     
-  
-    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
-    Management                                0        0                     
-  
-  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
+  > orvocfg-vswitch -m 1600 dvs0
+  $ orvocfg-vswitch -l > before && grep -E '^ *(vs[12]|dvs0|pg[ABC]) ' before
   vs1              64          2           64                9000    pnic1,pnic2
-  
-    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
     pgA                                       10       0           pnic2,pnic1
     pgB                                       0        0                     
-  
-  Switch Name      Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
   vs2              128         1           128               1500    pnic3     
-  
-    PortGroup Name                            VLAN ID  Used Ports  Uplinks   
     pgC                                       4095     0                     
-  
-  DVS Name         Num Ports   Used Ports  Configured Ports  MTU     Uplinks   
   dvs0             32          0           32                1600              
-  
-    DVPort ID                               In Use      Client      
-  
   $ tarnhost reboot
   $ orvocfg-vswitch -l; echo "status $?"
   status 1
   $ : > trace
-  $ orvocfg-vswitch -r && orvocfg-vswitch -R; echo $?
-  0
+  $ orvocfg-vswitch -r && orvocfg-vswitch -R
   $ calls 'RestoreDVSwitches|Refresh|RestoreVirtualSwitches|GetVirtualSwitches|RestoreUplinks'
   RestoreDVSwitches("/etc/tarnhost/dvs-cache.db")
   Refresh()
@@ -59,8 +36,7 @@ A configured host comes back exactly as it was after a reboot and -r, -R.
   $ orvocfg-vswitch -l | diff before - && echo same
   same
 
-When the distributed switches cannot be restored, the message alone is
-printed and the standard switches are restored all the same.
+A failed distributed switch restore: its message, and the rest goes on.
 
   $ tarnhost reboot
   $ tarnhost fault add RestoreDVSwitches --message 'cache unreadable' --detail 'cache unreadable in detail'
@@ -95,5 +71,4 @@ A failure of the standard switch restore is not caught.
 On a host without standard switches -R does nothing.
 
   $ tarnhost init --empty
-  $ orvocfg-vswitch -R; echo $?
-  0
+  $ orvocfg-vswitch -R

@@ -5,8 +5,7 @@ Creating and removing standard switches (-a, -d).
   $ tarnhost dvs add dvs0
   $ export TARN_TRACE=$PWD/trace
 
--a takes the four default policies in a fixed order, then creates the switch
-with the teaming policy first and the port count last.
+-a takes the four default policies in a fixed order, then creates the switch.
 
   $ orvocfg-vswitch -a sw1:64
   $ sed 1,2d trace
@@ -18,8 +17,7 @@ with the teaming policy first and the port count last.
   $ orvocfg-vswitch -c sw1
   1
 
-A refused creation is one line naming the switch as given; a failing default
-policy is reported the same way and creates nothing.
+A refused creation, or a failing default policy: one line, nothing created.
 
   $ orvocfg-vswitch -a sw1
   Failed to add vswitch: sw1, Error: Virtual switch sw1 already exists
@@ -33,15 +31,13 @@ policy is reported the same way and creates nothing.
 
 -d admits only a standard switch, or with --dvswitch any switch.
 
-  $ orvocfg-vswitch -d dvs0
+  $ for a in dvs0 nosuch '--dvswitch nosuch'; do orvocfg-vswitch -d $a 2>&1; echo "status $?"; done
   Not a valid virtual switch or it is a DVSwitch: dvs0
-  [1]
-  $ orvocfg-vswitch -d nosuch
+  status 1
   Not a valid virtual switch or it is a DVSwitch: nosuch
-  [1]
-  $ orvocfg-vswitch -d --dvswitch nosuch
+  status 1
   Not a valid virtual switch or it is a DVSwitch: nosuch
-  [1]
+  status 1
   $ orvocfg-vswitch -c dvs0
   1
   $ orvocfg-vswitch -d --dvswitch dvs0 && orvocfg-vswitch -d --dvswitch sw1
@@ -49,8 +45,7 @@ policy is reported the same way and creates nothing.
   0
   0
 
-Failures of the removal are the command's; failures of the admission check
-reach the run-wide handler.
+Failures of the removal are the command's, of the admission check fatal.
 
   $ tarnhost fault add RemoveVirtualSwitch --message 'switch busy'
   $ orvocfg-vswitch -d vswitch0

@@ -1,24 +1,18 @@
 #!/usr/bin/env python3
 """Many programs on one host at once.
 
-Eight processes add 100 port groups each to vswitch0 while four others link
-and unlink a pnic each on vs1, all through orvocfg-vswitch. Checks:
-  - no run failed, and none because the host was busy;
-  - every port group whose command exited 0 is in both layers;
-  - vs1's links in both layers are those of each pnic's last command;
-  - vs1's teaming order holds exactly its linked pnics, each once, all of
-    them active (no read-modify-write of the policy got lost).
+Eight processes add port groups to vswitch0 while four link and unlink a
+pnic each on vs1. No run may fail; every added port group and each pnic's
+last link state must be in both layers, and vs1's teaming order must hold
+its linked pnics once each, all active (no policy update lost).
 
 usage: concurrency.py BIN_DIR
 """
-import json
-import os
-import shutil
-import subprocess
 import sys
-import tempfile
 import threading
 import time
+
+from common import Host, names
 
 PG_WORKERS = 8
 PGS_PER_WORKER = 100
@@ -27,21 +21,8 @@ LINK_WORKERS = 4
 
 def main():
     bin_dir = sys.argv[1]
-    tool = os.path.join(bin_dir, "orvocfg-vswitch")
-    tarnhost = os.path.join(bin_dir, "tarnhost")
-    work = tempfile.mkdtemp(prefix="concurrency.")
-    env = dict(os.environ, TARN_HOST_DB=os.path.join(work, "host.db"))
-    env.pop("TARN_TRACE", None)
-    env.pop("TARN_LOCK_TIMEOUT", None)  # the default wait is part of the test
-
-    def run(*args):
-        return subprocess.run(args, env=env, capture_output=True, text=True, errors="replace")
-
-    def must(*args):
-        r = run(*args)
-        if r.returncode != 0:
-            sys.exit(f"setup failed: {' '.join(args)}: {r.stderr.strip()}")
-
+    host = Host(bin_dir, "concurrency.")
+    tool, tarnhost, run, must = host.tool, host.tarnhost, host.run, host.must
     must(tarnhost, "init")
     must(tool, "-a", "vs1")
     pnics = [f"pnic{4 + w}" for w in range(LINK_WORKERS)]
@@ -96,12 +77,9 @@ def main():
     if busy:
         failures.append(f"{busy} runs failed because the host was busy")
 
-    dump = run(tarnhost, "dump")
-    if dump.returncode != 0:
-        sys.exit(f"tarnhost dump failed: {dump.stderr}")
-    tables = json.loads(dump.stdout)["tables"]
+    tables = host.dump()["tables"]
     for layer in (0, 1):
-        present = {r["name"] for r in tables["portgroup"] if r["layer"] == layer}
+        present = names(tables["portgroup"], layer)
         added = {a[2] for a, rc, _ in runs if a[1] == "-A" and rc == 0}
         missing = sorted(added - present)
         if missing:
@@ -117,15 +95,8 @@ def main():
                             f"expected {sorted(expected)} all active")
 
     adds = sum(1 for a, _, _ in runs if a[1] == "-A")
-    print(f"{len(runs)} runs ({adds} port group adds, {len(runs) - adds} links and unlinks) "
-          f"in {elapsed:.1f} s; {len(failed)} failed")
-    for f in failures:
-        print("FAIL:", f)
-    if not failures:
-        shutil.rmtree(work)
-    else:
-        print("host kept in", work)
-    sys.exit(1 if failures else 0)
+    host.finish(f"{len(runs)} runs ({adds} port group adds, {len(runs) - adds} links and "
+                f"unlinks) in {elapsed:.1f} s; {len(failed)} failed", failures)
 
 
 if __name__ == "__main__":

@@ -1,27 +1,22 @@
 #!/usr/bin/env python3
 """Changes killed with SIGKILL at random moments.
 
-Each round runs a shell loop of changes (orvocfg-vswitch -A, -D and -a,
-tarnhost pnic add), logging "S k" before change k and "A k" once it exited
-0, and kills the whole loop after a random delay. After every kill:
-  - the host opens (tarnhost dump exits 0);
-  - sqlite3's PRAGMA integrity_check says ok;
-  - every acknowledged change is there, nothing that was never started is,
-    and a change that was started but not acknowledged is either there
-    whole or not at all (in both layers alike).
+Each round runs a logged shell loop of changes (-A, -D, -a, pnic add) and
+kills it after a random delay. Then the host must open, pass sqlite3's
+integrity check, hold every acknowledged change, nothing never started, and
+an unacknowledged one whole or not at all (both layers alike).
 
 usage: crash.py BIN_DIR [ROUNDS [SEED]]
 """
-import json
 import os
 import random
 import shlex
-import shutil
 import signal
 import subprocess
 import sys
-import tempfile
 import time
+
+from common import Host, names
 
 COMMANDS_PER_ROUND = 400
 
@@ -31,13 +26,9 @@ def main():
     rounds = int(sys.argv[2]) if len(sys.argv) > 2 else 120
     seed = int(sys.argv[3]) if len(sys.argv) > 3 else random.randrange(1 << 30)
     rng = random.Random(seed)
-    tool = os.path.join(bin_dir, "orvocfg-vswitch")
-    tarnhost = os.path.join(bin_dir, "tarnhost")
-    work = tempfile.mkdtemp(prefix="crash.")
-    db = os.path.join(work, "host.db")
-    env = dict(os.environ, TARN_HOST_DB=db)
-    env.pop("TARN_TRACE", None)
-    subprocess.run([tarnhost, "init"], env=env, check=True)
+    host = Host(bin_dir, "crash.")
+    tool, tarnhost, work, env = host.tool, host.tarnhost, host.work, host.env
+    host.must(tarnhost, "init")
 
     # name -> the states it may be in: {True} present, {False} absent.
     expected = {"pg": {}, "switch": {}, "pnic": {}}
@@ -83,44 +74,32 @@ def main():
             kind, name, present, _ = changes[k]
             expected[kind][name] = {present} if k in acked else {present, not present}
 
-        dump = subprocess.run([tarnhost, "dump"], env=env, capture_output=True, text=True)
-        if dump.returncode != 0:
-            failures.append(f"round {r}: host does not open: {dump.stderr.strip()}")
-            break
-        check = subprocess.run(["sqlite3", db, "PRAGMA integrity_check"], capture_output=True,
-                               text=True)
+        tables = host.dump()["tables"]
+        check = host.run("sqlite3", host.db, "PRAGMA integrity_check")
         if check.stdout.strip() != "ok":
             failures.append(f"round {r}: integrity check: {check.stdout.strip()} {check.stderr}")
             break
-        tables = json.loads(dump.stdout)["tables"]
         seen = {"pnic": {p["name"] for p in tables["pnic"]}}
         for layer in (0, 1):
-            pgs = {p["name"] for p in tables["portgroup"] if p["layer"] == layer}
-            switches = {s["name"] for s in tables["vswitch"] if s["layer"] == layer}
+            pgs, switches = names(tables["portgroup"], layer), names(tables["vswitch"], layer)
             if layer and (pgs != seen["pg"] or switches != seen["switch"]):
                 failures.append(f"round {r}: the layers differ")
             seen["pg"], seen["switch"] = pgs, switches
-        for kind, names in expected.items():
-            for name, allowed in names.items():
+        for kind, states in expected.items():
+            for name, allowed in states.items():
                 if (name in seen[kind]) not in allowed:
                     failures.append(f"round {r}: {kind} {name} is "
                                     f"{'there' if name in seen[kind] else 'missing'}")
-                names[name] = {name in seen[kind]}  # settled now
-            unknown = {n for n in seen[kind] if n[0] in "psn" and "_" in n} - set(names)
+                states[name] = {name in seen[kind]}  # settled now
+            unknown = {n for n in seen[kind] if n[0] in "psn" and "_" in n} - set(states)
             if unknown:
                 failures.append(f"round {r}: {kind} never started but there: {sorted(unknown)}")
         if failures:
             break
 
-    elapsed = time.monotonic() - start
-    print(f"seed {seed}: {r + 1} kills ({in_flight_kills} during a change), "
-          f"{acknowledged} acknowledged changes checked, in {elapsed:.1f} s")
-    for f in failures[:20]:
-        print("FAIL:", f)
-    if failures:
-        print("host kept in", work)
-        sys.exit(1)
-    shutil.rmtree(work)
+    host.finish(f"seed {seed}: {r + 1} kills ({in_flight_kills} during a change), "
+                f"{acknowledged} acknowledged changes checked, "
+                f"in {time.monotonic() - start:.1f} s", failures)
 
 
 if __name__ == "__main__":

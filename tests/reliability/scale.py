@@ -1,21 +1,20 @@
 #!/usr/bin/env python3
 """A host with 100,000 port groups goes through tarnhost load and dump.
 
-Builds the dump from the default host's own dump, loads it, dumps it again
-and compares the text; each step must finish within its time limit (about
-ten times what it takes on an idle 2-core machine: room for a busy machine,
-far too little for work that grows faster than the host), and the tool must
+Loads a dump built from the default host's, dumps it again and compares the
+text, each step within its limit (about ten times an idle 2-core machine's
+time: far too little for work growing faster than the host); the tool must
 still find a port group among them.
 
 usage: scale.py BIN_DIR [PORT_GROUPS]
 """
 import json
 import os
-import shutil
 import subprocess
 import sys
-import tempfile
 import time
+
+from common import Host
 
 LIMIT_SECONDS = {"load": 20, "dump": 10}
 
@@ -23,12 +22,9 @@ LIMIT_SECONDS = {"load": 20, "dump": 10}
 def main():
     bin_dir = sys.argv[1]
     count = int(sys.argv[2]) if len(sys.argv) > 2 else 100_000
-    tarnhost = os.path.join(bin_dir, "tarnhost")
-    work = tempfile.mkdtemp(prefix="scale.")
-    env = dict(os.environ, TARN_HOST_DB=os.path.join(work, "host.db"))
-    env.pop("TARN_TRACE", None)
-    base = json.loads(subprocess.run([tarnhost, "dump"], env=env, capture_output=True,
-                                     check=True).stdout)
+    host = Host(bin_dir, "scale.")
+    tarnhost, work, env = host.tarnhost, host.work, host.env
+    base = host.dump()
     tables = base["tables"]
     meta = {m["key"]: m for m in tables["meta"]}
     seq = int(meta["next_seq"]["value"])
@@ -58,20 +54,13 @@ def main():
     if not failures and subprocess.run(["cmp", "-s", big, os.path.join(work, "again.json")]).returncode:
         failures.append("the dump of the loaded host differs from the loaded dump")
     if not failures:
-        check = subprocess.run([os.path.join(bin_dir, "orvocfg-vswitch"), "-C", f"pg{count - 1}"],
-                               env=env, capture_output=True, text=True)
+        check = host.run(host.tool, "-C", f"pg{count - 1}")
         if check.stdout != "1\n":
             failures.append(f"orvocfg-vswitch -C pg{count - 1} said {check.stdout!r}")
 
     size = os.path.getsize(big) / 1e6
-    print(f"{count} port groups ({size:.0f} MB of JSON): load {timings.get('load', 0):.1f} s, "
-          f"dump {timings.get('dump', 0):.1f} s")
-    for f in failures:
-        print("FAIL:", f)
-    if failures:
-        print("kept in", work)
-        sys.exit(1)
-    shutil.rmtree(work)
+    host.finish(f"{count} port groups ({size:.0f} MB of JSON): load "
+                f"{timings.get('load', 0):.1f} s, dump {timings.get('dump', 0):.1f} s", failures)
 
 
 if __name__ == "__main__":
