@@ -10,7 +10,7 @@
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
-#include "tarnctl/admin.h"
+#include "tarnctl/admin/host.h"
 #include "tarnhost/args.h"
 
 namespace TarnHost {

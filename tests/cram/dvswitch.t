@@ -7,6 +7,7 @@ Distributed switches: creation parameters, DVPort uplinks, the DVPort test event
 By default the UUID comes from the name, and the switch is a version 6 cswitch.
 
   $ orvocfg-vswitch -a --dvswitch dvs0:64
+  created a new default host at */host.db (glob)
   $ calls AddDVSwitch
   AddDVSwitch("64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00", "dvs0", "cswitch", "dvs0", 64, 6, 0)
 

@@ -8,6 +8,7 @@ ENS: the activation node, activation, deactivation and reassociation.
 -y sets the node, then activates ENS with the two modifier flags.
 
   $ orvocfg-vswitch -y vswitch0
+  created a new default host at */host.db (glob)
   $ calls "$ens"
   NODI_CheckSig(out, 21, out)
   GetIntParamList(1, 0)

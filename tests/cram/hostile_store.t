@@ -12,6 +12,7 @@ Another application's database, a newer schema, text, empty, truncated:
   Cannot open host database PWD/other.db: not a host database (application id 0x0)
 
   $ tarnhost init && cp host.db newer.db && sqlite3 newer.db 'PRAGMA user_version=2'
+  created a new default host at */host.db (glob)
   $ TARN_HOST_DB=$PWD/newer.db try newer.db -a vs1
   status 1, unchanged, 1 line(s):
   Cannot open host database PWD/newer.db: schema version 2 is newer than this library's 1
@@ -19,12 +20,13 @@ Another application's database, a newer schema, text, empty, truncated:
   $ printf 'not a database %.0s' $(seq 300) > text.db
   $ TARN_HOST_DB=$PWD/text.db try text.db -l
   status 1, unchanged, 1 line(s):
-  Cannot open host database PWD/text.db: file is not a database
+  Cannot open host database PWD/text.db: not a host database (not an SQLite database)
 
   $ : > empty.db
   $ TARN_HOST_DB=$PWD/empty.db try empty.db -c vswitch0
-  status 1, unchanged, 1 line(s):
-  Cannot open host database PWD/empty.db: not a host database (empty file)
+  status 0, 1 line(s):
+  created a new default host at */empty.db (glob)
+  1
 
   $ cp host.db cut.db && truncate -s 4096 cut.db
   $ TARN_HOST_DB=$PWD/cut.db try cut.db -L pnic1 vswitch0
@@ -40,5 +42,5 @@ tarnhost refuses them the same way and does not replace them on init:
 A location where nothing can be written:
 
   $ TARN_HOST_DB=/proc/self/host.db orvocfg-vswitch -l; echo $?
-  Cannot open host database /proc/self/host.db: cannot open its lock file /proc/self/host.db.lock: No such file or directory
+  Cannot create host database /proc/self/host.db: No such file or directory
   1

@@ -6,6 +6,7 @@ The -l tables: fixed-width fields, padded and never cut; "$" marks line ends.
 A standard switch with two links and three clients (all ports configured).
 
   $ tarnhost init --empty && tarnhost pnic add pnic0 && tarnhost pnic add pnic1
+  created a new default host at */host.db (glob)
   $ vs -a vswitch0:1536 && vs -L pnic0 && vs -L pnic1 && vs -A Management && vs -A Guests
   $ vs -v 100 -p Guests && vs -M pnic1 -p Management && vs -M pnic0 -p Management
   $ tarnhost client add Management vm1 && tarnhost client add Guests vm2 && tarnhost client add Guests vm3

@@ -13,6 +13,7 @@ A configured host comes back exactly as it was after a reboot and -r, -R.
   > orvocfg-vswitch -M pnic2 -p pgA vs1 && orvocfg-vswitch -M pnic1 -p pgA vs1 &&
   > orvocfg-vswitch -m 9000 vs1 && orvocfg-vswitch -a --dvswitch dvs0:32 &&
   > orvocfg-vswitch -m 1600 dvs0
+  created a new default host at */host.db (glob)
   $ orvocfg-vswitch -l > before && grep -E '^ *(vs[12]|dvs0|pg[ABC]) ' before
   vs1              64          2           64                9000    pnic1,pnic2
     pgA                                       10       0           pnic2,pnic1

@@ -2,6 +2,7 @@ Active uplink count and discovery status (-X, -x, -B, -b).
 
   $ . "$TESTDIR/setup.sh"
   $ tarnhost init
+  created a new default host at */host.db (glob)
 
   $ orvocfg-vswitch -x vswitch0
   1

@@ -76,6 +76,7 @@ Bad usage: the reason and the usage text on standard error, no host opened.
 The default host as a dump.
 
   $ tarnhost dump | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
+  created a new default host at */host.db (glob)
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
 
 Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
@@ -99,15 +100,15 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   status 1 tarnhost: Pnic pnic0 already exists
   status 1 tarnhost: Portgroup nosuch does not exist
   status 1 tarnhost: Virtual switch vswitch0 already exists
-  status 1 tarnhost: Invalid number of ports 4097: must be 8 to 4096
+  status 1 tarnhost: Invalid number of ports 4097
   status 1 tarnhost: pnic0 is already linked to vswitch0
   status 1 tarnhost: Uplink pnic9 does not exist
-  status 1 tarnhost: MTU 1279 is out of range (1280 to 9000)
-  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
+  status 1 tarnhost: MTU 1279 is out of range
+  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long
   status 1 tarnhost: DVS nosuch does not exist
-  status 1 tarnhost: Invalid number of used ports 17: must be 0 to 16
-  status 1 tarnhost: Invalid timeout 256: must be 0 to 255
-  status 1 tarnhost: Invalid times 0: must be >= 1
+  status 1 tarnhost: Invalid number of used ports 17
+  status 1 tarnhost: Invalid timeout 256
+  status 1 tarnhost: Invalid times 0
   status 1 tarnhost: Fault operation is empty
   $ tarnhost dump | cmp - before.json
 
@@ -123,17 +124,19 @@ Seeding shows up, and a dump brings it all back.
   $ tarnhost timeout lag ps0 2 255
   $ tarnhost fault add SetVlanId --on pg2 --skip 1 --message boom
   $ tarnhost fault add -- -odd
+  tarnhost: Unknown operation -odd
+  [1]
   $ tarnhost show | sed -n '1p;/^Stored/,$p'
   Physical NICs: pnic0, pnic1, pnic2, pnic3, pnic4
   Stored configuration
     Standard switch vswitch0: 128 ports, MTU 1500, CDP listen
       Uplinks: pnic0
-      Teaming: flags 0x10, order pnic0, max active 1, balancing 0, failback 0
+      Teaming: flags 0x10, balancing 0, failback 0, order pnic0, max active 1
       Port group Management: VLAN 0, clients vm1
-        Teaming: flags 0x0, order (not set), max active 0, balancing 0, failback 0
+        Teaming: flags 0x0, balancing 0, failback 0, order (not set), max active 0
     Standard switch sys0 (system): 64 ports, MTU 1500, CDP listen
       Uplinks: (none)
-      Teaming: flags 0x10, order (none), max active 0, balancing 0, failback 0
+      Teaming: flags 0x10, balancing 0, failback 0, order (none), max active 0
     Uplink timeouts: vswitch0 pnic0 LAG 1: 5
     LAG timeouts: ps0 LAG 2: 255
   
@@ -153,7 +156,6 @@ Seeding shows up, and a dump brings it all back.
   
   Faults
     SetVlanId on pg2: lets 1 pass, then fails 1; message "boom", detail "injected fault in SetVlanId"
-    -odd: lets 0 pass, then fails 1; message "injected fault", detail "injected fault in -odd"
   $ tarnhost dump > seeded.json
   $ tarnhost fault clear
   $ tarnhost reboot

@@ -2,6 +2,7 @@ Creating and removing standard switches (-a, -d).
 
   $ . "$TESTDIR/setup.sh"
   $ tarnhost init
+  created a new default host at */host.db (glob)
   $ tarnhost dvs add dvs0
   $ export TARN_TRACE=$PWD/trace
 

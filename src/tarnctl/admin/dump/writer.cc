@@ -1,0 +1,117 @@
+// The whole host as a JSON document:
+//   {
+//     "format": "tarnhost-dump",
+//     "version": 1,
+//     "tables": { "<table>": [ {<column>: <value>, ...}, ... ], ... }
+//   }
+// every table in catalogue order, its rows in the catalogue's order, each
+// row's fields in column order, indented by two spaces. Teaming policies
+// appear as objects with every field, opaque uplinks as arrays. A text that
+// is not valid UTF-8 appears as {"hex": "<bytes in hex>"}.
+//
+// The host is not held twice: each row is made a JSON value and written
+// into the text at once.
+#include <string>
+
+#include "tarnctl/admin/dump/catalogue.h"
+#include "tarnctl/admin/host.h"
+#include "tarnctl/admin/state.h"
+#include "tarnctl/model/names.h"
+#include "tarnctl/store/policy_codec.h"
+
+namespace TarnCtl::Admin {
+
+namespace {
+
+using Dump::Kind;
+using Json = Store::Json;
+
+constexpr int kIndent = 2;
+// Rows stand at depth 3 of the document.
+constexpr int kRowDepth = 3;
+
+Json TextJson(const std::string& text) {
+  if (Model::IsUtf8(text)) return text;
+  static const char* hex = "0123456789abcdef";
+  std::string digits;
+  for (const unsigned char c : text) digits += {hex[c >> 4], hex[c & 15]};
+  return Json{{"hex", digits}};
+}
+
+Json NamesJson(const std::vector<std::string>& names) {
+  Json array = Json::array();
+  for (const auto& name : names) array.push_back(TextJson(name));
+  return array;
+}
+
+Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value) {
+  switch (column.kind) {
+    case Kind::kInt:
+      return std::get<int64_t>(value);
+    case Kind::kOptText:
+      if (std::holds_alternative<std::monostate>(value)) return nullptr;
+      [[fallthrough]];
+    case Kind::kText:
+      return TextJson(std::get<std::string>(value));
+    case Kind::kPolicy: {
+      const auto policy = Store::DecodeTeamingPolicy(std::get<std::string>(value));
+      Json json = Store::PolicyToJson(policy, Store::PolicyForm::kFull);
+      json["uplinkOrder"] = NamesJson(policy.uplinkOrder);
+      return json;
+    }
+    case Kind::kNames:
+      return NamesJson(Store::DecodeNameList(std::get<std::string>(value)));
+  }
+  return nullptr;
+}
+
+// Appends `json` as it stands at `depth` of the document.
+void Append(std::string& out, const Json& json, int depth) {
+  const std::string text = json.dump(kIndent);
+  const std::string newline = "\n" + std::string(kIndent * depth, ' ');
+  for (const char c : text) {
+    if (c == '\n') {
+      out += newline;
+    } else {
+      out += c;
+    }
+  }
+}
+
+}  // namespace
+
+std::string Host::Dump(const Progress& progress) {
+  Store::Db& db = state_->db();
+  int64_t total = 0;
+  for (const auto& table : Dump::Tables()) total += Store::Rows::Count(db, table.Shape());
+  int64_t done = 0;
+
+  std::string out = "{\n  \"format\": ";
+  Append(out, Dump::kFormat, 1);
+  out += ",\n  \"version\": " + std::to_string(Dump::kVersion) + ",\n  \"tables\": {";
+  bool firstTable = true;
+  for (const auto& table : Dump::Tables()) {
+    out += firstTable ? "\n    " : ",\n    ";
+    firstTable = false;
+    Append(out, table.name, 2);
+    out += ": [";
+    bool firstRow = true;
+    Store::Rows::Scan(db, table.Shape(), [&](const std::vector<Store::Rows::Value>& values) {
+      Json row = Json::object();
+      for (size_t i = 0; i < values.size(); ++i) {
+        row[table.columns[i].name] = ValueJson(table.columns[i], values[i]);
+      }
+      out += firstRow ? "\n      " : ",\n      ";
+      firstRow = false;
+      Append(out, row, kRowDepth);
+      if (progress && ++done % 4096 == 0) progress(done, total);
+    });
+    if (!firstRow) out += "\n    ";
+    out += "]";
+  }
+  out += "\n  }\n}\n";
+  if (progress) progress(total, total);
+  return out;
+}
+
+}  // namespace TarnCtl::Admin

@@ -1,0 +1,99 @@
+// Administration of the simulated host: what the tool cannot do itself.
+// Used by tarnhost. A Host holds the process's session (and with it the
+// host's lock and one transaction) for its lifetime; each call applies the
+// same rules the library applies and is undone whole when refused.
+// Refusals throw HostCtl::Lib::HostCtlException with a message that says
+// what and why.
+#pragma once
+
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace TarnCtl::Admin {
+
+struct DVSwitchSeed {
+  std::string name;
+  std::optional<std::string> portset;   // default: the name
+  std::optional<std::string> switchId;  // default: derived from the name, unique
+  int32_t ports = 128;
+  uint32_t mtu = 1500;
+  std::vector<std::string> uplinks;  // pnics, must be free
+};
+
+struct DVPortSeed {
+  std::string dvs;  // switch name
+  std::string portId;
+  std::vector<std::string> clients;
+  uint32_t connectionId = 0;
+};
+
+struct OpaqueSeed {
+  std::string name;
+  std::optional<std::string> portset;  // default: the name
+  int32_t ports = 128;
+  int32_t used = 0;
+  std::vector<std::string> uplinks;
+};
+
+struct FaultSeed {
+  std::string operation;
+  std::optional<std::string> on;  // object or argument name; none: any call
+  std::optional<std::string> message;
+  std::optional<std::string> detail;
+  int64_t skip = 0;
+  int64_t times = 1;
+};
+
+// Reports progress of a long operation: rows done so far of `total`.
+using Progress = std::function<void(int64_t done, int64_t total)>;
+
+class Host {
+ public:
+  Host();   // opens the host (creating the default one if missing)
+  ~Host();  // commits
+  Host(const Host&) = delete;
+  Host& operator=(const Host&) = delete;
+
+  // The host file.
+  const std::string& Path() const;
+  // Makes what was done so far durable; throws when it cannot.
+  void Commit();
+
+  // Replaces the host: the default host, or with `empty` nothing at all.
+  void Init(bool empty);
+  // Drops the running state, keeps the stored configuration.
+  void Reboot();
+
+  void AddPnic(const std::string& name);
+  void AddClient(const std::string& portGroup, const std::string& client);
+  void AddSystemSwitch(const std::string& name, int32_t ports);
+  void AddDVSwitch(const DVSwitchSeed& seed);
+  void AddDVPort(const DVPortSeed& seed);
+  void AddOpaqueSwitch(const OpaqueSeed& seed);
+  void AddUplinkTimeout(const std::string& portset, const std::string& uplink, uint32_t lagId,
+                        uint32_t timeout);
+  void AddLagTimeout(const std::string& portset, uint32_t lagId, uint32_t timeout);
+  void AddFault(const FaultSeed& seed);
+  void ClearFaults();
+
+  // The whole host as readable text: running state, stored configuration,
+  // ENS state, timeouts, armed faults.
+  std::string Show();
+  // The whole host as JSON (stable key and row order, ending in a newline);
+  // Load(Dump()) leaves a host whose Dump() is the same text.
+  std::string Dump(const Progress& progress = nullptr);
+  // Replaces the whole host with a dump; refuses a malformed or
+  // inconsistent dump without changing anything.
+  void Load(const std::string& json, const Progress& progress = nullptr);
+
+  struct State;
+
+ private:
+  std::unique_ptr<State> state_;
+};
+
+}  // namespace TarnCtl::Admin

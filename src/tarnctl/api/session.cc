@@ -1,0 +1,109 @@
+#include "tarnctl/api/session.h"
+
+#include <pthread.h>
+#include <unistd.h>
+
+#include <cstdio>
+#include <cstdlib>
+
+namespace TarnCtl::Api {
+
+using HostCtl::Lib::HostCtlException;
+
+namespace {
+
+struct Process {
+  std::weak_ptr<Session> session;
+  pid_t owner = 0;                          // a forked child must not use its parent's session
+  std::optional<Store::Location> location;  // set by tests
+};
+
+Process& This() {
+  static Process process;
+  return process;
+}
+
+}  // namespace
+
+Session::Session(std::unique_ptr<Store::HostFile> host) : host_(std::move(host)) {
+  run_.emplace(host_->db());
+}
+
+Session::~Session() {
+  End();
+}
+
+void Session::End() noexcept {
+  if (!run_) return;
+  try {
+    run_->Commit();
+    run_.reset();
+  } catch (const HostCtlException& e) {
+    std::fprintf(stderr, "%s\n", e.GetDetailedMessage().c_str());
+    std::fflush(stderr);
+    _exit(1);
+  }
+}
+
+void Session::Commit() {
+  run_->Commit();
+  run_.reset();
+  run_.emplace(host_->db());
+}
+
+Store::Location Session::DefaultLocation() {
+  if (This().location) return *This().location;
+  return Store::ResolveLocation(Store::ProcessEnvironment());
+}
+
+void Session::UseLocation(std::optional<Store::Location> location) {
+  This().location = std::move(location);
+}
+
+std::shared_ptr<Session> Session::Current() {
+  Process& process = This();
+  if (process.owner != getpid()) return nullptr;
+  return process.session.lock();
+}
+
+std::shared_ptr<Session> Session::Acquire() {
+  if (auto current = Current()) return current;
+  return AcquireAt(DefaultLocation(),
+                   {Store::LockTimeoutFrom(std::getenv("TARN_LOCK_TIMEOUT")), true});
+}
+
+std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
+                                            const Store::OpenOptions& options) {
+  if (auto current = Current()) return current;
+  Process& process = This();
+  if (process.owner != 0 && process.owner != getpid()) {
+    // A forked child's copy of its parent's session stays untouched: its
+    // connection and lock belong to the parent.
+    new std::weak_ptr<Session>(std::move(process.session));
+    process.session.reset();
+  }
+  auto host = Store::HostFile::Open(location, options);
+  if (host->created()) {
+    std::fprintf(stderr, "created a new default host at %s\n", host->path().c_str());
+    std::fflush(stderr);
+  }
+  std::shared_ptr<Session> session(new Session(std::move(host)));
+  process.session = session;
+  process.owner = getpid();
+  static const bool registered = [] {
+    // A run that ends through exit() keeps what it changed.
+    std::atexit([] {
+      if (auto open = Current()) open->End();
+    });
+    // A forked child lets go of its copy of the lock descriptor, so that the
+    // parent's release is a release (flock locks belong to the descriptor).
+    pthread_atfork(nullptr, nullptr, [] {
+      if (auto parent = This().session.lock()) parent->host_->ForgetLockInChild();
+    });
+    return true;
+  }();
+  (void)registered;
+  return session;
+}
+
+}  // namespace TarnCtl::Api

@@ -1,0 +1,67 @@
+// The process's hold on its host: the open host file (with its lock) and
+// the run's transaction.
+//
+// Contracts:
+//  - One Session per process at a time. Acquire() opens it on first use at
+//    the location the environment names (TARN_HOST_DB and friends, read
+//    here, at the library's edge; TARN_LOCK_TIMEOUT likewise) and hands out
+//    shared references; it ends when the last reference goes.
+//  - A session is one transaction. Everything changed through it is
+//    committed when it ends, or when the process exits through exit() while
+//    it is open; nothing is when the process dies otherwise (killed,
+//    aborted): the next opener finds the host as it was before. Each
+//    operation inside it is a savepoint, undone whole when it fails.
+//  - A host file that the opening made is reported once on standard error:
+//    "created a new default host at PATH".
+//  - A forked child does not use its parent's session (Current() is null
+//    there) and leaves the parent's lock alone.
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "tarnctl/store/host_file.h"
+#include "tarnctl/store/location.h"
+#include "tarnctl/store/transaction.h"
+
+namespace TarnCtl::Api {
+
+class Session {
+ public:
+  // The process's session, opened when none is open.
+  static std::shared_ptr<Session> Acquire();
+  // The open session, or nullptr.
+  static std::shared_ptr<Session> Current();
+  // Opens the process's session at `location` with `options` (tarnhost's
+  // completion asks for no wait and no creation).
+  static std::shared_ptr<Session> AcquireAt(const Store::Location& location,
+                                            const Store::OpenOptions& options);
+  // Makes Acquire() open `location` instead of the environment's (tests);
+  // nullopt goes back to the environment.
+  static void UseLocation(std::optional<Store::Location> location);
+  // Where Acquire() would open the host.
+  static Store::Location DefaultLocation();
+
+  ~Session();
+  Session(const Session&) = delete;
+  Session& operator=(const Session&) = delete;
+
+  Store::Db& db() { return host_->db(); }
+  const std::string& path() const { return host_->path(); }
+
+  // Commits the run so far (throwing what the commit meets) and goes on in
+  // a new transaction.
+  void Commit();
+
+ private:
+  explicit Session(std::unique_ptr<Store::HostFile> host);
+  // Commits the run for good; a failure is reported on standard error and
+  // ends the process with status 1, since the run's changes are lost.
+  void End() noexcept;
+
+  std::unique_ptr<Store::HostFile> host_;
+  std::optional<Store::Transaction> run_;
+};
+
+}  // namespace TarnCtl::Api

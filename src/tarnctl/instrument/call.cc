@@ -1,0 +1,84 @@
+#include "tarnctl/instrument/call.h"
+
+#include "tarnctl/instrument/faults.h"
+#include "tarnctl/store/db.h"
+
+namespace TarnCtl::Instrument {
+
+namespace {
+const char* g_running = nullptr;
+}  // namespace
+
+Target Nothing() {
+  return {};
+}
+
+Target On(const std::string& name) {
+  return {name, {name}, ""};
+}
+
+Target On(const std::string& switchName, const std::string& portsetName) {
+  return {switchName, {switchName, portsetName}, ""};
+}
+
+Target Named(const std::string& argument) {
+  return {"", {argument}, ""};
+}
+
+Target Of(const std::string& record) {
+  return {"", {record}, record + "::"};
+}
+
+Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault)
+    : db_(db), previous_(g_running) {
+  const Operation& operation = Describe(op);
+  g_running = operation.name;
+  if (db_ != nullptr) {
+    previousContext_ = db_->context();
+    db_->set_context(operation.name);
+  }
+  if (TraceOn()) {
+    std::string line = target.scope + operation.name + '(' + args + ')';
+    if (!target.on.empty()) {
+      line += " on ";
+      AppendEscaped(line, target.on);
+    }
+    WriteTraceLine(line);
+  }
+  if (db_ == nullptr) return;
+  try {
+    auto fault = TakeFault(*db_, operation.name, target.names);
+    if (!fault) return;
+    if (onFault == OnFault::kReport) {
+      failed_ = true;
+      return;
+    }
+    throw *fault;
+  } catch (...) {
+    db_->set_context(previousContext_);
+    g_running = previous_;
+    throw;
+  }
+}
+
+Call::~Call() {
+  if (db_ != nullptr) db_->set_context(previousContext_);
+  g_running = previous_;
+}
+
+const char* Call::Running() {
+  return g_running;
+}
+
+Scope::Scope(Store::Db& db, const char* name)
+    : db_(db), previous_(g_running), previousContext_(db.context()) {
+  g_running = name;
+  db_.set_context(name);
+}
+
+Scope::~Scope() {
+  db_.set_context(previousContext_);
+  g_running = previous_;
+}
+
+}  // namespace TarnCtl::Instrument

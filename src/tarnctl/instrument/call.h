@@ -1,0 +1,130 @@
+// The entry of every library operation: one trace line (trace.h), then the
+// armed faults (faults.h).
+//
+//   TARN_CALL(db, SetVlanId, On(name), vlanId);
+//
+// declares the Call object `tarn_call_` for the rest of the scope, naming
+// the operation from the registry (operations.h); it does not compile
+// unless the operation is the function it is written in. The arguments
+// are formatted only when the trace is on. While the object lives,
+// database errors and refusals (errors.h) name the operation.
+#pragma once
+
+#include <source_location>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "tarnctl/instrument/operations.h"
+#include "tarnctl/instrument/trace.h"
+
+namespace TarnCtl::Store {
+class Db;
+}
+
+namespace TarnCtl::Instrument {
+
+// What a call acts on: `on` follows " on " in the trace line (empty: no
+// " on"); `names` are what a fault's target may equal; `scope` precedes the
+// operation's name in the trace line.
+struct Target {
+  std::string on;
+  std::vector<std::string> names;
+  std::string scope;
+};
+
+// A call of a static function or an information object with no name.
+Target Nothing();
+// A call on the object `name`.
+Target On(const std::string& name);
+// A call on a distributed or opaque switch: traced with its switch name,
+// matched by its switch name or its portset name.
+Target On(const std::string& switchName, const std::string& portsetName);
+// A call that is given the name `argument` (a lookup, a static function,
+// an information-object operation).
+Target Named(const std::string& argument);
+// A static function of the record class `record`: traced as
+// "<record>::<operation>(...)", matched by the record's name.
+Target Of(const std::string& record);
+
+class Call {
+ public:
+  enum class OnFault { kThrow, kReport };
+
+  // Traces the call (when the trace is on, with the text `args()` returns)
+  // and applies the faults armed on `db`'s host (none when `db` is null).
+  // With kThrow a fault throws its HostCtlException; with kReport it only
+  // sets failed().
+  template <typename Args>
+  Call(Store::Db* db, Op op, const Target& target, Args args, OnFault onFault = OnFault::kThrow)
+      : Call(db, op, target, TraceOn() ? args() : std::string(), onFault) {}
+  ~Call();
+  Call(const Call&) = delete;
+  Call& operator=(const Call&) = delete;
+
+  bool failed() const { return failed_; }
+  // The innermost operation running, or nullptr.
+  static const char* Running();
+
+ private:
+  Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault);
+
+  Store::Db* db_;
+  const char* previous_;
+  const char* previousContext_ = nullptr;
+  bool failed_ = false;
+};
+
+// An administration step that is not a library operation (tarnhost's
+// commands): no trace line and no faults, but refusals and database errors
+// name `name` while it lives.
+class Scope {
+ public:
+  Scope(Store::Db& db, const char* name);
+  ~Scope();
+  Scope(const Scope&) = delete;
+  Scope& operator=(const Scope&) = delete;
+
+ private:
+  Store::Db& db_;
+  const char* previous_;
+  const char* previousContext_;
+};
+
+// True when `function` (a function's name as the compiler writes it) is the
+// function `operation`, a constructor of that class included.
+constexpr bool IsFunction(std::string_view function, std::string_view operation) {
+  for (size_t at = function.find(operation); at != std::string_view::npos;
+       at = function.find(operation, at + 1)) {
+    const bool start = at == 0 || function[at - 1] == ':' || function[at - 1] == ' ';
+    const size_t end = at + operation.size();
+    if (start && end < function.size() && function[end] == '(') return true;
+  }
+  return false;
+}
+
+}  // namespace TarnCtl::Instrument
+
+#define TARN_CHECK_OPERATION(op)                                                               \
+  static_assert(                                                                               \
+      ::TarnCtl::Instrument::IsFunction(std::source_location::current().function_name(), #op), \
+      "operation " #op " is not the function it is written in")
+
+#define TARN_CALL(db, op, target, ...)                                                           \
+  TARN_CHECK_OPERATION(op);                                                                      \
+  ::TarnCtl::Instrument::Call tarn_call_((db), ::TarnCtl::Instrument::Op::k##op, (target), [&] { \
+    return ::TarnCtl::Instrument::FormatArgs(__VA_ARGS__);                                       \
+  })
+
+// The same for calls that must not throw: a fault only sets
+// tarn_call_.failed().
+#define TARN_CALL_REPORTING(db, op, target, ...)                      \
+  TARN_CHECK_OPERATION(op);                                           \
+  ::TarnCtl::Instrument::Call tarn_call_(                             \
+      (db), ::TarnCtl::Instrument::Op::k##op, (target),               \
+      [&] { return ::TarnCtl::Instrument::FormatArgs(__VA_ARGS__); }, \
+      ::TarnCtl::Instrument::Call::OnFault::kReport)
+
+// The entry of an operation on an object whose state `state` has db() and
+// CallTarget().
+#define TARN_CALL_ON(state, op, ...) TARN_CALL(&(state).db(), op, (state).CallTarget(), __VA_ARGS__)

@@ -1,0 +1,22 @@
+// How the library words its refusals.
+//
+// A refusal (a name taken, a value out of range, an unknown object) is a
+// HostCtlException whose message is a short sentence saying what and why
+// ("Portgroup pg1 already exists"), and whose detailed message starts with
+// the name of the operation that is running and adds where or why
+// ("AddPortGroup: Portgroup pg1 already exists on this host"). Refusals
+// never name the database file; database failures do (store/db.h).
+#pragma once
+
+#include <string>
+
+#include "hostctl/exception.h"
+
+namespace TarnCtl::Instrument {
+
+// A refusal of the operation that is running (Call or Scope): message
+// `message`, detailed message "<operation>: <message>" followed by
+// " <where>" when `where` is not empty.
+HostCtl::Lib::HostCtlException Refused(const std::string& message, const std::string& where = "");
+
+}  // namespace TarnCtl::Instrument

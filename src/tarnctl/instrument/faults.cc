@@ -1,0 +1,67 @@
+#include "tarnctl/instrument/faults.h"
+
+#include <algorithm>
+
+#include "tarnctl/store/db.h"
+#include "tarnctl/store/faults.h"
+#include "tarnctl/store/transaction.h"
+
+namespace TarnCtl::Instrument {
+
+using HostCtl::Lib::HostCtlException;
+
+namespace {
+
+// The faults of the last connection that asked, while they are current.
+struct Cache {
+  uint64_t serial = 0;
+  int64_t changeCount = -1;
+  std::vector<Store::Faults::Row> rows;
+};
+
+std::vector<Store::Faults::Row>& Rows(Store::Db& db) {
+  static Cache cache;
+  if (cache.serial != db.serial() || cache.changeCount != db.ChangeCount()) {
+    cache.rows = Store::Faults::List(db);
+    cache.serial = db.serial();
+    cache.changeCount = db.ChangeCount();
+  }
+  return cache.rows;
+}
+
+bool Matches(const Store::Faults::Row& row, const char* operation,
+             const std::vector<std::string>& names) {
+  if (row.operation != operation || (row.skip <= 0 && row.times <= 0)) return false;
+  return !row.target || std::find(names.begin(), names.end(), *row.target) != names.end();
+}
+
+}  // namespace
+
+std::optional<HostCtlException> TakeFault(Store::Db& db, const char* operation,
+                                          const std::vector<std::string>& names) {
+  const auto& rows = Rows(db);
+  const auto row = std::find_if(rows.begin(), rows.end(), [&](const auto& candidate) {
+    return Matches(candidate, operation, names);
+  });
+  if (row == rows.end()) return std::nullopt;
+
+  const Store::Faults::Row fault = *row;
+  const bool fails = fault.skip <= 0;
+  {
+    Store::Transaction transaction(db);
+    if (fails) {
+      Store::Faults::UseTime(db, fault.id);
+    } else {
+      Store::Faults::UseSkip(db, fault.id);
+    }
+    transaction.Commit();
+  }
+  if (!fails) return std::nullopt;
+  const std::string message =
+      fault.message.empty() ? "Injected failure of " + std::string(operation) : fault.message;
+  const std::string detail =
+      fault.detail.empty() ? std::string(operation) + ": " + message : fault.detail;
+  return HostCtlException(message, detail);
+}
+
+}  // namespace TarnCtl::Instrument

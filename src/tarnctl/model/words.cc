@@ -1,0 +1,63 @@
+#include "tarnctl/model/words.h"
+
+#include <algorithm>
+
+#include "hostctl/uuid_text.h"
+#include "tarnctl/instrument/errors.h"
+
+namespace TarnCtl::Model {
+
+namespace {
+
+// "a, b or c" of `words`.
+template <size_t N>
+std::string Alternatives(const std::array<const char*, N>& words) {
+  std::string text;
+  for (size_t i = 0; i < N; ++i) {
+    if (i > 0) text += i + 1 == N ? " or " : ", ";
+    text += words[i];
+  }
+  return text;
+}
+
+}  // namespace
+
+int32_t CdpStatusOfWord(const std::string& word) {
+  for (size_t i = 0; i < kCdpWords.size(); ++i) {
+    if (word == kCdpWords[i]) return static_cast<int32_t>(i);
+  }
+  throw Instrument::Refused("Unknown CDP status " + word,
+                            "(expected " + Alternatives(kCdpWords) + ")");
+}
+
+std::string CdpWord(int64_t status) {
+  return status >= 0 && status < static_cast<int64_t>(kCdpWords.size()) ? kCdpWords[status]
+                                                                        : std::to_string(status);
+}
+
+bool IsUuidText(const std::string& text) {
+  int consumed = 0;
+  return HostCtl::Text::ScanUuid(text.c_str(), &consumed) == HostCtl::Text::kUuidBytes &&
+         consumed == static_cast<int>(text.size());
+}
+
+void CheckUuid(const std::string& text) {
+  if (!IsUuidText(text)) {
+    throw Instrument::Refused(
+        "Invalid UUID " + text,
+        "(expected xx xx xx xx xx xx xx xx-xx xx xx xx xx xx xx xx in hexadecimal)");
+  }
+}
+
+std::string UuidOfName(const std::string& name) {
+  return HostCtl::Text::UuidOfText(name.c_str());
+}
+
+void CheckImplClass(const std::string& implClass) {
+  if (std::find(kImplClasses.begin(), kImplClasses.end(), implClass) == kImplClasses.end()) {
+    throw Instrument::Refused("Unknown implementation class " + implClass,
+                              "(" + Alternatives(kImplClasses) + ")");
+  }
+}
+
+}  // namespace TarnCtl::Model

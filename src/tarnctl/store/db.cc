@@ -1,0 +1,205 @@
+// The connection: a statement cache and SQLite's errors turned into the
+// library's exception.
+#include "tarnctl/store/db.h"
+
+#include <sqlite3.h>
+
+#include <atomic>
+#include <cassert>
+#include <string_view>
+#include <unordered_map>
+
+#include "tarnctl/store/transaction.h"
+
+namespace TarnCtl::Store {
+
+using HostCtl::Lib::HostCtlException;
+
+namespace {
+
+// Waits this long for another connection's SQLite lock (another program
+// opening the file with SQLite itself) before failing as busy.
+constexpr int kBusyTimeoutMs = 5000;
+
+std::atomic<uint64_t> g_serials{0};
+
+}  // namespace
+
+struct Statement::Cached {
+  sqlite3_stmt* stmt = nullptr;
+  bool inUse = false;
+};
+
+struct Db::Cache {
+  std::unordered_map<std::string, std::unique_ptr<Statement::Cached>> statements;
+};
+
+// --- Statement ---
+
+Statement::Statement(Db& db, Cached* cached) : db_(&db), cached_(cached) {
+  assert(!cached_->inUse && "two live handles of one statement");
+  cached_->inUse = true;
+}
+
+Statement::Statement(Statement&& other) noexcept : db_(other.db_), cached_(other.cached_) {
+  other.cached_ = nullptr;
+}
+
+Statement::~Statement() {
+  if (cached_ == nullptr) return;
+  sqlite3_reset(cached_->stmt);
+  sqlite3_clear_bindings(cached_->stmt);
+  cached_->inUse = false;
+}
+
+Statement& Statement::Bind(int index, int64_t value) {
+  if (sqlite3_bind_int64(cached_->stmt, index, value) != SQLITE_OK) db_->Fail();
+  return *this;
+}
+
+Statement& Statement::Bind(int index, const std::string& value) {
+  if (sqlite3_bind_text(cached_->stmt, index, value.data(), static_cast<int>(value.size()),
+                        SQLITE_TRANSIENT) != SQLITE_OK) {
+    db_->Fail();
+  }
+  return *this;
+}
+
+Statement& Statement::BindNull(int index) {
+  if (sqlite3_bind_null(cached_->stmt, index) != SQLITE_OK) db_->Fail();
+  return *this;
+}
+
+bool Statement::Step() {
+  const int rc = sqlite3_step(cached_->stmt);
+  if (rc == SQLITE_ROW) return true;
+  if (rc == SQLITE_DONE) return false;
+  db_->Fail();
+}
+
+void Statement::Run() {
+  while (Step()) {
+  }
+}
+
+int64_t Statement::Int(int column) const {
+  return sqlite3_column_int64(cached_->stmt, column);
+}
+
+std::string Statement::Text(int column) const {
+  const auto* text = sqlite3_column_text(cached_->stmt, column);
+  if (text == nullptr) return {};
+  return std::string(reinterpret_cast<const char*>(text),
+                     sqlite3_column_bytes(cached_->stmt, column));
+}
+
+bool Statement::IsNull(int column) const {
+  return sqlite3_column_type(cached_->stmt, column) == SQLITE_NULL;
+}
+
+bool Statement::IsInteger(int column) const {
+  return sqlite3_column_type(cached_->stmt, column) == SQLITE_INTEGER;
+}
+
+// --- Db ---
+
+Db::Db(sqlite3* handle, std::string path)
+    : handle_(handle), path_(std::move(path)), serial_(++g_serials), cache_(new Cache) {}
+
+Db::~Db() {
+  for (auto& [sql, cached] : cache_->statements) sqlite3_finalize(cached->stmt);
+  sqlite3_close_v2(handle_);
+}
+
+std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& path) {
+  sqlite3* handle = nullptr;
+  const int rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
+  if (handle != nullptr) sqlite3_busy_timeout(handle, kBusyTimeoutMs);
+  std::unique_ptr<Db> db(new Db(handle, path));
+  if (rc != SQLITE_OK) db->Fail();
+  sqlite3_extended_result_codes(handle, 1);
+  return db;
+}
+
+std::unique_ptr<Db> Db::OpenMemory(const std::string& name) {
+  sqlite3* handle = nullptr;
+  const int rc = sqlite3_open_v2(":memory:", &handle, SQLITE_OPEN_READWRITE, nullptr);
+  std::unique_ptr<Db> db(new Db(handle, name));
+  if (rc != SQLITE_OK) db->Fail();
+  return db;
+}
+
+Statement Db::Prepare(const std::string& sql) {
+  auto found = cache_->statements.find(sql);
+  if (found != cache_->statements.end()) return Statement(*this, found->second.get());
+  auto cached = std::make_unique<Statement::Cached>();
+  if (sqlite3_prepare_v3(handle_, sql.c_str(), static_cast<int>(sql.size()),
+                         SQLITE_PREPARE_PERSISTENT, &cached->stmt, nullptr) != SQLITE_OK) {
+    Fail();
+  }
+  Statement::Cached* raw = cached.get();
+  cache_->statements.emplace(sql, std::move(cached));
+  return Statement(*this, raw);
+}
+
+void Db::Exec(const std::string& sql) {
+  if (sqlite3_exec(handle_, sql.c_str(), nullptr, nullptr, nullptr) != SQLITE_OK) Fail();
+}
+
+std::vector<std::string> Db::QueryPlan(const std::string& sql) {
+  sqlite3_stmt* stmt = nullptr;
+  const std::string explain = "EXPLAIN QUERY PLAN " + sql;
+  if (sqlite3_prepare_v2(handle_, explain.c_str(), -1, &stmt, nullptr) != SQLITE_OK) Fail();
+  std::vector<std::string> steps;
+  while (sqlite3_step(stmt) == SQLITE_ROW) {
+    steps.emplace_back(reinterpret_cast<const char*>(sqlite3_column_text(stmt, 3)));
+  }
+  sqlite3_finalize(stmt);
+  return steps;
+}
+
+int64_t Db::ChangeCount() const {
+  return sqlite3_total_changes64(handle_);
+}
+
+HostCtlException Db::Error(const std::string& cause) const {
+  const std::string message = "Host database " + path_ + ": " + cause;
+  return HostCtlException(message,
+                          context_ != nullptr ? std::string(context_) + ": " + message : message);
+}
+
+void Db::Fail() const {
+  throw Error(handle_ != nullptr ? sqlite3_errmsg(handle_) : "out of memory");
+}
+
+// --- Transaction ---
+
+Transaction::Transaction(Db& db) : db_(db), depth_(db.depth_) {
+  db_.Exec(depth_ == 0 ? "BEGIN IMMEDIATE" : "SAVEPOINT inner");
+  ++db_.depth_;
+}
+
+Transaction::~Transaction() {
+  if (done_) return;
+  db_.depth_ = depth_;
+  try {
+    if (depth_ == 0) {
+      db_.Exec("ROLLBACK");
+    } else {
+      db_.Exec("ROLLBACK TO inner");
+      db_.Exec("RELEASE inner");
+    }
+  } catch (const HostCtlException&) {
+    // SQLite may have ended the transaction itself (a full disk, an I/O
+    // error); there is nothing left to undo then.
+  }
+}
+
+void Transaction::Commit() {
+  assert(db_.depth_ == depth_ + 1 && "commit of a transaction that is not the innermost");
+  db_.Exec(depth_ == 0 ? "COMMIT" : "RELEASE inner");
+  db_.depth_ = depth_;
+  done_ = true;
+}
+
+}  // namespace TarnCtl::Store

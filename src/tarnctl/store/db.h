@@ -1,0 +1,116 @@
+// A connection to one host database, and the statements run on it.
+//
+// Contracts:
+//  - Prepare() hands out a statement from the connection's cache (keyed by
+//    the SQL text); the handle resets and unbinds it when it goes.
+//    REQUIRES: no two live handles of the same SQL text (asserted in debug
+//    builds).
+//  - Every database failure is a HostCtlException whose message names the
+//    database file ("Host database <path>: <cause>") and whose detailed
+//    message starts with the label set by set_context(), when there is one
+//    (the library operation that is running).
+//  - Transactions (transaction.h) nest: the outermost is a real transaction,
+//    inner ones are savepoints. depth() tells how deep the caller is.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "hostctl/exception.h"
+
+struct sqlite3;
+struct sqlite3_stmt;
+
+namespace TarnCtl::Store {
+
+class Db;
+
+class Statement {
+ public:
+  Statement(Statement&& other) noexcept;
+  Statement(const Statement&) = delete;
+  Statement& operator=(const Statement&) = delete;
+  ~Statement();
+
+  // Parameters are numbered from 1.
+  Statement& Bind(int index, int64_t value);
+  Statement& Bind(int index, const std::string& value);
+  Statement& BindNull(int index);
+
+  // Advances to the next row: true while a row is available.
+  bool Step();
+  // Steps until the statement is done.
+  void Run();
+
+  // Columns are numbered from 0.
+  int64_t Int(int column) const;
+  std::string Text(int column) const;
+  bool IsNull(int column) const;
+  bool IsInteger(int column) const;
+
+ private:
+  friend class Db;
+  struct Cached;
+  Statement(Db& db, Cached* cached);
+
+  Db* db_;
+  Cached* cached_;
+};
+
+class Db {
+ public:
+  // Opens the existing database file `file` read-write; `path` is how
+  // messages name it. The busy timeout is set before anything is read.
+  static std::unique_ptr<Db> OpenFile(const std::string& file, const std::string& path);
+  // A private database in memory, named `name` in messages.
+  static std::unique_ptr<Db> OpenMemory(const std::string& name);
+
+  ~Db();
+  Db(const Db&) = delete;
+  Db& operator=(const Db&) = delete;
+
+  const std::string& path() const { return path_; }
+
+  Statement Prepare(const std::string& sql);
+  // Runs SQL without results (several statements allowed).
+  void Exec(const std::string& sql);
+  // The steps of SQLite's plan for `sql`, one line each (for the check
+  // that no statement scans a growing table).
+  std::vector<std::string> QueryPlan(const std::string& sql);
+
+  // Rows inserted, changed or deleted through this connection so far.
+  // Lets callers keep copies of rows and notice that they may be stale.
+  int64_t ChangeCount() const;
+  // A number no other connection of this process had: caches keyed by a
+  // connection survive its address being reused.
+  uint64_t serial() const { return serial_; }
+
+  // What is running, for the detailed message of database errors (not
+  // owned; nullptr: nothing).
+  const char* context() const { return context_; }
+  void set_context(const char* context) { context_ = context; }
+
+  // Transaction nesting (transaction.h keeps it).
+  int depth() const { return depth_; }
+
+  // The database failure `cause` on this file.
+  HostCtl::Lib::HostCtlException Error(const std::string& cause) const;
+  [[noreturn]] void Fail() const;
+
+ private:
+  friend class Statement;
+  friend class Transaction;
+  Db(sqlite3* handle, std::string path);
+
+  sqlite3* handle_;
+  std::string path_;
+  uint64_t serial_;
+  const char* context_ = nullptr;
+  int depth_ = 0;
+  struct Cache;
+  std::unique_ptr<Cache> cache_;
+};
+
+}  // namespace TarnCtl::Store

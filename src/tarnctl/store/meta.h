@@ -1,0 +1,20 @@
+// The host's counters and flags (table meta).
+#pragma once
+
+#include <cstdint>
+
+namespace TarnCtl::Store {
+class Db;
+}
+
+namespace TarnCtl::Store::Meta {
+
+// The next value of the ordering counter that every `seq` column draws
+// from. REQUIRES: inside a transaction.
+int64_t NextSeq(Db& db);
+
+// Whether the ENS activation node was set since boot.
+bool EnsNodeSet(Db& db);
+void SetEnsNode(Db& db, uint32_t value);
+
+}  // namespace TarnCtl::Store::Meta

@@ -1,0 +1,89 @@
+#include "tarnctl/store/rows.h"
+
+#include "tarnctl/store/db.h"
+
+namespace TarnCtl::Store::Rows {
+
+namespace {
+
+std::string ColumnList(const Shape& shape) {
+  std::string list;
+  for (const char* column : shape.columns) list += (list.empty() ? "" : ", ") + std::string(column);
+  return list;
+}
+
+int64_t Single(Db& db, const std::string& sql) {
+  auto select = db.Prepare(sql);
+  return select.Step() ? select.Int(0) : 0;
+}
+
+// Runs INSERT OR `conflict` of one row: whether a row went in.
+bool InsertOr(Db& db, const char* conflict, const Shape& shape, const std::vector<Value>& values) {
+  std::string marks;
+  for (size_t i = 1; i <= shape.columns.size(); ++i) marks += (i > 1 ? ", ?" : "?");
+  auto insert = db.Prepare("INSERT OR " + std::string(conflict) + " INTO " + shape.table + "(" +
+                           ColumnList(shape) + ") VALUES (" + marks + ") RETURNING 1");
+  for (size_t i = 0; i < values.size(); ++i) {
+    const int index = static_cast<int>(i) + 1;
+    if (const auto* number = std::get_if<int64_t>(&values[i])) {
+      insert.Bind(index, *number);
+    } else if (const auto* text = std::get_if<std::string>(&values[i])) {
+      insert.Bind(index, *text);
+    } else {
+      insert.BindNull(index);
+    }
+  }
+  bool inserted = false;
+  while (insert.Step()) inserted = true;
+  return inserted;
+}
+
+}  // namespace
+
+void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector<Value>&)>& each) {
+  auto select = db.Prepare("SELECT " + ColumnList(shape) + " FROM " + shape.table + " ORDER BY " +
+                           shape.order);
+  std::vector<Value> values(shape.columns.size());
+  while (select.Step()) {
+    for (size_t i = 0; i < values.size(); ++i) {
+      const int column = static_cast<int>(i);
+      if (select.IsNull(column)) {
+        values[i] = std::monostate{};
+      } else if (select.IsInteger(column)) {
+        values[i] = select.Int(column);
+      } else {
+        values[i] = select.Text(column);
+      }
+    }
+    each(values);
+  }
+}
+
+bool Insert(Db& db, const Shape& shape, const std::vector<Value>& values) {
+  return InsertOr(db, "IGNORE", shape, values);
+}
+
+void Replace(Db& db, const Shape& shape, const std::vector<Value>& values) {
+  InsertOr(db, "REPLACE", shape, values);
+}
+
+void Clear(Db& db, const Shape& shape) {
+  db.Exec(std::string("DELETE FROM ") + shape.table);
+}
+
+void AssignPlaceholders(Db& db, const Shape& shape, const char* column, int64_t base) {
+  db.Prepare(std::string("UPDATE ") + shape.table + " SET " + column + " = ? - " + column +
+             " WHERE " + column + " < 0")
+      .Bind(1, base)
+      .Run();
+}
+
+int64_t Max(Db& db, const Shape& shape, const char* column) {
+  return Single(db, std::string("SELECT coalesce(max(") + column + "), 0) FROM " + shape.table);
+}
+
+int64_t Count(Db& db, const Shape& shape) {
+  return Single(db, std::string("SELECT count(*) FROM ") + shape.table);
+}
+
+}  // namespace TarnCtl::Store::Rows

@@ -1,0 +1,291 @@
+// The administration of the simulated host: seeding refusals, and the dump
+// that must reproduce a host exactly and refuse any faulty document
+// without touching the host.
+#include <gtest/gtest.h>
+#include <stdlib.h>
+
+#include <functional>
+#include <string>
+
+#include <nlohmann/json.hpp>
+#include "host_fixture.h"
+#include "hostctl/exception.h"
+#include "tarnctl/admin/host.h"
+
+namespace {
+
+using TarnCtl::Admin::Host;
+
+class AdminTest : public HostTest {
+ protected:
+  void UseDatabase(const std::string& name) {
+    setenv("TARN_HOST_DB", (dir_ + "/" + name).c_str(), 1);
+  }
+
+  // A host with something in every table the administration can fill.
+  static void Seed(Host& host) {
+    host.AddPnic("pnic4");
+    host.AddPnic("pnic5");
+    host.AddClient("Management", "vm1");
+    host.AddClient("Management", "vm2");
+    host.AddSystemSwitch("sys0", 64);
+    host.AddDVSwitch({"dvs0", "ps0", std::nullopt, 256, 9000, {"pnic1", "pnic2"}});
+    host.AddDVPort({"dvs0", "100", {"vmA", "vmB"}, 42});
+    host.AddDVPort({"dvs0", "101", {}, 0});
+    host.AddOpaqueSwitch({"opq0", std::nullopt, 32, 5, {"pnic3"}});
+    host.AddUplinkTimeout("vswitch0", "pnic0", 7, 255);
+    host.AddLagTimeout("dvs0", 3, 0);
+    // Fault texts are free bytes, not necessarily text.
+    host.AddFault({"SetVlanId", "pg2", "boom\xff\"q\"\n", "boom in detail", 1, 2});
+    host.AddFault({"GetName", std::nullopt, std::nullopt, std::nullopt, 0, 1});
+  }
+};
+
+TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
+  std::string dumped, shown;
+  {
+    Host host;
+    Seed(host);
+    dumped = host.Dump();
+    shown = host.Show();
+  }
+  ASSERT_EQ(dumped.back(), '\n');
+  for (const char* part : {"\"hex\":", "\"uplinkOrder\": [\n", "\"target\": null"}) {
+    EXPECT_NE(dumped.find(part), std::string::npos) << part;
+  }
+  // Into an emptied host, and into a brand-new file.
+  for (const char* db : {"host.db", "other.db"}) {
+    UseDatabase(db);
+    Host host;
+    host.Init(true);
+    host.Load(dumped);
+    EXPECT_EQ(host.Dump(), dumped) << db;
+    EXPECT_EQ(host.Show(), shown) << db;
+  }
+}
+
+// What is safe to infer is inferred: tables left out are empty, keys come
+// in any order, and counters left out are assigned in file order.
+TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
+  Host host;
+  Seed(host);
+  const std::string good = host.Dump();
+  auto document = nlohmann::json::parse(good);  // keys sorted, as `jq -S` writes them
+  auto& tables = document["tables"];
+  tables.erase("fault");
+  for (auto& [name, rows] : tables.items()) {
+    for (auto& row : rows) row.erase("seq");
+  }
+  tables["meta"] = nlohmann::json::array();  // next_seq and ens_node: inferred
+  host.Load(nlohmann::json{
+      {"tables", {{"meta", nlohmann::json::array()}}}, {"version", 1}, {"format", "tarnhost-dump"}}
+                .dump());
+  host.Load(document.dump());
+  const std::string shown = host.Show();
+  EXPECT_EQ(shown.substr(0, shown.find("Faults")), [&] {
+    Host copy;
+    copy.Load(good);
+    copy.ClearFaults();
+    const std::string all = copy.Show();
+    return all.substr(0, all.find("Faults"));
+  }());
+}
+
+// The refusals the tarnhost transcript does not already show.
+TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
+  const std::string tooLong(32, 'x');
+  auto dvs = [](TarnCtl::Admin::DVSwitchSeed seed) {
+    return [seed](Host& h) { h.AddDVSwitch(seed); };
+  };
+  const struct {
+    const char* what;
+    std::function<void(Host&)> call;
+    const char* message;
+  } cases[] = {
+      {"pnic empty", [](Host& h) { h.AddPnic(""); }, "Pnic name is empty"},
+      {"pnic long", [&](Host& h) { h.AddPnic(tooLong); }, "is too long"},
+      {"pnic not text", [](Host& h) { h.AddPnic("\xff"); }, "Pnic name is not valid UTF-8 text"},
+      {"pnic comma", [](Host& h) { h.AddPnic("c,d"); }, "Pnic name c,d contains a comma"},
+      {"client twice", [](Host& h) { h.AddClient("Management", "vm1"); },
+       "Client vm1 is already on portgroup Management"},
+      {"client unnamed", [](Host& h) { h.AddClient("Management", ""); }, "Client name is empty"},
+      {"client escape", [](Host& h) { h.AddClient("Management", "\x1b[2J"); },
+       "Client name contains a control character"},
+      {"name of a portset", [](Host& h) { h.AddSystemSwitch("ps0", 64); }, "ps0 already exists"},
+      {"ports low", [](Host& h) { h.AddSystemSwitch("s", 7); }, "Invalid number of ports 7"},
+      {"pnic of a dvs", dvs({"d", {}, {}, 128, 1500, {"pnic1"}}),
+       "pnic1 is already linked to dvs0"},
+      {"pnic of opaque", dvs({"d", {}, {}, 128, 1500, {"pnic3"}}),
+       "pnic3 is already linked to opq0"},
+      {"pnic twice", dvs({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}}),
+       "Uplink pnic4 is given twice"},
+      {"dvs mtu", dvs({"d", {}, {}, 128, 9001, {}}), "MTU 9001 is out of range"},
+      {"dvs id taken", dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
+       "A DVS with id dvs-dvs0 already exists"},
+      {"dvs name taken", dvs({"dvs0", "p9", {}, 128, 1500, {}}), "dvs0 already exists"},
+      {"dvport twice",
+       [](Host& h) {
+         h.AddDVPort({"dvs0", "100", {}, 0});
+       },
+       "DVPort 100 already exists on dvs0"},
+      {"dvport client twice",
+       [](Host& h) {
+         h.AddDVPort({"dvs0", "7", {"a", "a"}, 0});
+       },
+       "Client a is given twice"},
+      {"uplink timeout twice", [](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
+       "already stored"},
+      {"lag timeout unnamed portset", [](Host& h) { h.AddLagTimeout("", 3, 1); },
+       "Portset name is empty"},
+      {"fault negative skip",
+       [](Host& h) {
+         h.AddFault({"GetName", {}, {}, {}, -1, 1});
+       },
+       "Invalid skip count -1"},
+      {"fault misspelt",
+       [](Host& h) {
+         h.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
+       },
+       "Unknown operation SetVlanID"},
+  };
+  Host host;
+  Seed(host);
+  const std::string before = host.Dump();
+  for (const auto& c : cases) {
+    const auto [message, detail] = Refused([&] { c.call(host); });
+    EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
+    EXPECT_EQ(detail.rfind("Add", 0), 0u) << c.what;
+    EXPECT_EQ(host.Dump(), before) << c.what;
+  }
+  EXPECT_EQ(Refused([&] {
+              host.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
+            }).second,
+            "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)");
+}
+
+TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {
+  Host host;
+  host.AddDVSwitch({"dvs0", {}, {}, 128, 1500, {}});
+  host.AddDVSwitch({"x", "dvs-dvs0", {}, 128, 1500, {}});
+  host.AddSystemSwitch("sys0", 64);
+  const std::string dump = host.Dump();
+  // An id derived from the name (never the portset) stays unique.
+  EXPECT_NE(dump.find("\"switch_id\": \"dvs-dvs0\""), std::string::npos);
+  EXPECT_NE(dump.find("\"switch_id\": \"dvs-x\""), std::string::npos);
+  // Both layers hold the system switch.
+  size_t at = 0;
+  int copies = 0;
+  while ((at = dump.find("\"name\": \"sys0\"", at)) != std::string::npos) ++copies, ++at;
+  EXPECT_EQ(copies, 2);
+  EXPECT_NE(dump.find("\"system\": 1"), std::string::npos);
+}
+
+// Load holds a dump to the rules the library applies: every value, and
+// every invariant across rows. Each faulty dump is refused naming what is
+// wrong, and the host stays as it was.
+TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
+  using Json = nlohmann::ordered_json;
+  Host host;
+  Seed(host);
+  const std::string good = host.Dump();
+  // The dump with `change` made to its document.
+  auto changed = [&](const std::function<void(Json&)>& change) {
+    Json document = Json::parse(good);
+    change(document["tables"]);
+    return document.dump(2);
+  };
+  auto whole = [&](const std::function<void(Json&)>& change) {
+    Json document = Json::parse(good);
+    change(document);
+    return document.dump(2);
+  };
+  auto row = [](Json& tables, const char* table, const char* key,
+                const std::string& value) -> Json& {
+    for (auto& r : tables[table]) {
+      if (r[key] == value) return r;
+    }
+    throw std::runtime_error(std::string("no row ") + value);
+  };
+  auto client = [](int i) {
+    return Json{{"portgroup", "Management"}, {"name", "c" + std::to_string(i)}};
+  };
+  const struct {
+    const char* what;
+    std::string text;
+    const char* message;
+  } cases[] = {
+      {"trailing text", good + "x", "not valid JSON"},
+      {"array", "[]", "a dump is a JSON object"},
+      {"version as text", whole([](Json& d) { d["version"] = "1"; }), "must be an integer"},
+      {"version missing", whole([](Json& d) { d.erase("version"); }), "key \"version\" is missing"},
+      {"format wrong", whole([](Json& d) { d["format"] = "other"; }), "\"format\" must be"},
+      {"table unknown", changed([](Json& t) { t["faults"] = Json::array(); }),
+       "unknown table \"faults\""},
+      {"table not an array", changed([](Json& t) { t["ens"] = Json::object(); }),
+       "table \"ens\" must be an array"},
+      {"field missing",
+       changed([&](Json& t) { row(t, "portgroup", "name", "Management").erase("vlan"); }),
+       "table \"portgroup\", row 1, field \"vlan\": is missing"},
+      {"field unknown", changed([&](Json& t) { row(t, "pnic", "name", "pnic4")["colour"] = 1; }),
+       "unknown field \"colour\""},
+      {"wrong type",
+       changed([&](Json& t) { row(t, "portgroup", "name", "Management")["vlan"] = "0"; }),
+       "must be an integer"},
+      {"vlan", changed([&](Json& t) { row(t, "portgroup", "name", "Management")["vlan"] = 4096; }),
+       "field \"vlan\": VLAN id 4096 is out of range (0-4095)"},
+      {"mtu", changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["mtu"] = -1500; }),
+       "MTU -1500 is out of range (1280-9000)"},
+      {"name with a newline",
+       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic5\nx"; }),
+       "field \"name\": Pnic name contains a control character (byte 6)"},
+      {"policy incomplete",
+       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"].erase("maxActive"); }),
+       "field \"policy\": maxActive is missing"},
+      {"policy negative",
+       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"]["maxActive"] = -5; }),
+       "Invalid max active uplinks -5"},
+      {"policy repeats a pnic", changed([&](Json& t) {
+         row(t, "vswitch", "name", "sys0")["policy"]["uplinkOrder"] = {"pnic4", "pnic4"};
+       }),
+       "Uplink pnic4 appears twice in the teaming order"},
+      {"duplicate row",
+       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic4"; }),
+       "repeats the key of an earlier row"},
+      {"opaque repeats a pnic", changed([&](Json& t) {
+         row(t, "opaque", "name", "opq0")["uplinks"] = {"pnic4", "pnic4"};
+       }),
+       "names pnic4 twice"},
+      {"opaque takes a linked pnic",
+       changed([&](Json& t) { row(t, "opaque", "name", "opq0")["uplinks"] = {"pnic0"}; }),
+       "pnic pnic0 is used by two switches of the running state"},
+      {"opaque overused",
+       changed([&](Json& t) { row(t, "opaque", "name", "opq0")["used_ports"] = 100; }),
+       "Invalid number of used ports 100 (0-32)"},
+      {"switch overfull", changed([&](Json& t) {
+         for (int i = 0; i < 200; ++i) t["client"].push_back(client(i));
+       }),
+       "switch vswitch0 has 203 ports in use but only 128 ports"},
+      {"dangling port group",
+       changed([&](Json& t) { row(t, "portgroup", "name", "Management")["switch"] = "gone"; }),
+       "belongs to switch gone"},
+      {"unknown fault operation",
+       changed([&](Json& t) { t["fault"][0]["operation"] = "SetVlanID"; }),
+       "Unknown operation SetVlanID"},
+      {"counter zero", changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "0"; }),
+       "\"next_seq\" must be a number from 1 to"},
+      {"counter at the end", changed([&](Json& t) {
+         row(t, "meta", "key", "next_seq")["value"] = "9223372036854775807";
+       }),
+       "\"next_seq\" must be a number from 1 to"},
+      {"counter behind",
+       changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "3"; }),
+       "is not beyond the largest seq"},
+  };
+  for (const auto& c : cases) {
+    const std::string message = Refusal([&] { host.Load(c.text); });
+    EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
+    EXPECT_EQ(host.Dump(), good) << c.what;
+  }
+}
+
+}  // namespace

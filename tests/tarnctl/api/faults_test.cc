@@ -1,0 +1,153 @@
+// Armed failures: which calls a fault row matches, how skip and times count
+// down, that the counts are kept across sessions and processes, and the
+// node calls' own ways of failing.
+#include "host_fixture.h"
+#include "hostctl/nodi.h"
+#include "tarnctl/api/session.h"
+
+namespace {
+
+namespace HN = HostCtl::Network;
+using HN::NetworkFactory;
+using TarnCtl::Admin::FaultSeed;
+using TarnCtl::Network::NetworkInfoImpl;
+using TarnCtl::Network::PortGroupImpl;
+
+using FaultTest = HostTest;
+
+void Arm(FaultSeed seed) {
+  TarnCtl::Admin::Host().AddFault(seed);
+}
+
+FaultSeed Fault(const char* operation, std::optional<std::string> on = std::nullopt,
+                int64_t skip = 0, int64_t times = 1) {
+  return {operation, std::move(on), "armed", "armed in detail", skip, times};
+}
+
+// "P" when `call` passes, "F" when the armed fault fails it.
+std::string Outcome(const std::function<void()>& call) {
+  try {
+    call();
+    return "P";
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    return e.GetMessage() == "armed" ? "F" : "?" + e.GetMessage();
+  }
+}
+
+TEST_F(FaultTest, SkipAndTimesCountDown) {
+  struct Case {
+    int64_t skip, times;
+    const char* outcomes;
+  };
+  const std::vector<Case> cases = {
+      {0, 1, "FPPPP"}, {1, 2, "PFFPP"}, {3, 1, "PPPFP"}, {0, 4, "FFFFP"}};
+  NetworkInfoImpl network;
+  PortGroupImpl pg("Management");
+  for (const Case& c : cases) {
+    Arm(Fault("SetVlanId", std::nullopt, c.skip, c.times));
+    std::string outcomes;
+    for (int i = 0; i < 5; ++i) outcomes += Outcome([&] { pg.SetVlanId(7); });
+    EXPECT_EQ(outcomes, c.outcomes) << "skip " << c.skip << " times " << c.times;
+  }
+  // The row's texts are the exception's, and the first matching row fires.
+  Arm({"GetVlanId", std::nullopt, "first", "first in detail", 0, 1});
+  Arm({"GetVlanId", std::nullopt, "second", "second in detail", 0, 1});
+  try {
+    pg.GetVlanId();
+    ADD_FAILURE() << "no fault";
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    EXPECT_EQ(e.GetMessage(), "first");
+    EXPECT_EQ(e.GetDetailedMessage(), "first in detail");
+  }
+  EXPECT_EQ(Refusal([&] { pg.GetVlanId(); }), "second");
+}
+
+// The transcripts fail pg, switch, DVPort and opaque portset targets; here
+// the other kinds, and calls that a target must not catch.
+TEST_F(FaultTest, ATargetMatchesTheObjectOrTheNameArgument) {
+  SeedSampleHost();
+  NetworkInfoImpl network;
+  auto info = network.GetVirtualSwitchInfo();
+  struct Case {
+    FaultSeed fault;
+    std::function<void()> call;
+    const char* outcome;
+  };
+  auto dvsMtu = [] { Dvs("dvs0")->GetMTU(); };
+  const std::vector<Case> cases = {
+      {Fault("SetVlanId", "pg1"), [] { PortGroupImpl("pg2").SetVlanId(1); }, "P"},
+      {Fault("GetMTU", "vs1"), dvsMtu, "P"},
+      {Fault("GetMTU", "dvs0"), dvsMtu, "F"},
+      {Fault("GetMTU", "dvs0-ps"), dvsMtu, "F"},
+      {Fault("GetVirtualSwitchById", "vs1"), [] { Switch("vswitch0"); }, "P"},
+      {Fault("SwitchExists", "vs9"), [&] { info->SwitchExists("vs9"); }, "F"},
+      {Fault("RemoveVirtualSwitch", "vs1"), [&] { info->RemoveVirtualSwitch("vs1"); }, "F"},
+      {Fault("GetDefaultPolicy", "ShapingPolicy"), [] { HN::NicTeamingPolicy::GetDefaultPolicy(); },
+       "P"},
+      {Fault("GetDefaultPolicy", "ShapingPolicy"), [] { HN::ShapingPolicy::GetDefaultPolicy(); },
+       "F"},
+      {Fault("GetDefaultPolicy"), [] { HN::NicCapabilities::GetDefaultPolicy(); }, "F"},
+      {Fault("SetMaxActiveUplinks"), [] { HN::NicTeamingPolicy().SetMaxActiveUplinks(1); }, "F"},
+      {Fault("Refresh"), [&] { info->Refresh(); }, "F"},
+  };
+  TarnCtl::Admin::Host admin;
+  for (const Case& c : cases) {
+    admin.ClearFaults();
+    admin.AddFault(c.fault);
+    EXPECT_EQ(Outcome(c.call), c.outcome) << c.fault.operation << " on " << c.fault.on.value_or("");
+  }
+}
+
+TEST_F(FaultTest, CountsAreKeptAcrossSessionsAndProcesses) {
+  Arm(Fault("GetNumPorts", std::nullopt, 1, 2));
+  auto numPorts = [] {
+    NetworkInfoImpl network;
+    Switch("vswitch0")->GetNumPorts();
+  };
+  EXPECT_EQ(Outcome(numPorts), "P");
+  EXPECT_EQ(TarnCtl::Api::Session::Current(), nullptr);
+  EXPECT_EQ(Outcome(numPorts), "F");
+  EXPECT_EQ(InChild([&] { return Outcome(numPorts) == "F" ? 0 : 1; }), 0);
+  EXPECT_EQ(Outcome(numPorts), "P");
+  // A fault armed while a session is open applies to its next call.
+  NetworkInfoImpl network;
+  auto vs0 = Switch("vswitch0");
+  EXPECT_EQ(Outcome([&] { vs0->GetMTU(); }), "P");
+  Arm(Fault("GetMTU"));
+  EXPECT_EQ(Outcome([&] { vs0->GetMTU(); }), "F");
+}
+
+// Record functions check faults only within an open session, and open none.
+TEST_F(FaultTest, RecordFunctionsUseOnlyAnOpenSession) {
+  Arm(Fault("GetDefaultPolicy"));
+  EXPECT_EQ(Outcome([] { HN::ShapingPolicy::GetDefaultPolicy(); }), "P");
+  EXPECT_EQ(TarnCtl::Api::Session::Current(), nullptr);
+  NetworkInfoImpl network;
+  EXPECT_EQ(Outcome([] { HN::ShapingPolicy::GetDefaultPolicy(); }), "F");
+}
+
+// Armed node faults: the ens transcript. Here the node calls' own refusals.
+TEST_F(FaultTest, NodeCallsReportByStatus) {
+  NODI_SigResult result;
+  uint32_t info = 0;
+  EXPECT_EQ(NODI_CheckSig(&result, 21, &info), TARN_OK);
+  EXPECT_EQ(NODI_CheckSig(&result, 20, &info), TARN_VERSION_MISMATCH);
+  EXPECT_EQ(TarnCtl::Api::Session::Current(), nullptr);  // held for the call only
+  NODI_ParamList* list = TarnCtl::Util::SysinfoUtil::GetIntParamList(1, NODI_PARAM_LIST_INT);
+  ASSERT_NE(list, nullptr);
+  EXPECT_EQ(NODI_Set(NODI_NODE_net_ens_activate + 1, 0, list, 0, 0), TARN_NOT_FOUND);
+  EXPECT_EQ(NODI_Set(NODI_NODE_net_ens_activate, 0, nullptr, 0, 0), TARN_BAD_PARAM);
+  EXPECT_EQ(NODI_Set(NODI_NODE_net_ens_activate, 0, list, 0, 0), TARN_OK);
+  NODI_ParamListDestroy(list);
+
+  // A busy host makes the node calls fail, not throw.
+  NetworkInfoImpl network;
+  setenv("TARN_LOCK_TIMEOUT", "0", 1);
+  EXPECT_EQ(InChild([] {
+              NODI_SigResult r;
+              return NODI_CheckSig(&r, 21, nullptr) == TARN_FAILURE ? 0 : 1;
+            }),
+            0);
+}
+
+}  // namespace

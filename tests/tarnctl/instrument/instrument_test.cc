@@ -1,0 +1,84 @@
+// The operation registry, and the trace's refusal to hang or die on a bad
+// trace file.
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <stdlib.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "tarnctl/instrument/call.h"
+#include "tarnctl/instrument/operations.h"
+#include "tarnctl/instrument/trace.h"
+
+namespace {
+
+using namespace TarnCtl::Instrument;
+
+TEST(OperationsTest, OneEntryPerNameInNameOrder) {
+  const auto& operations = Operations();
+  for (size_t i = 0; i < operations.size(); ++i) {
+    EXPECT_EQ(static_cast<size_t>(operations[i].op), i) << operations[i].name;
+    if (i > 0) {
+      EXPECT_LT(std::string(operations[i - 1].name), operations[i].name);
+    }
+    EXPECT_EQ(FindOperation(operations[i].name), &operations[i]);
+  }
+  EXPECT_EQ(FindOperation("SetVlanID"), nullptr);
+  const struct {
+    const char* given;
+    const char* nearest;
+  } cases[] = {
+      {"SetVlanID", "SetVlanId"},      {"getmtu", "GetMTU"}, {"AddPortgroup", "AddPortGroup"},
+      {"RemoveUplnk", "RemoveUplink"}, {"Frobnicate", ""},   {"", ""}};
+  for (const auto& c : cases) {
+    EXPECT_EQ(NearestOperation(c.given).value_or(""), c.nearest) << c.given;
+  }
+  EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
+}
+
+TEST(OperationsTest, AnOperationIsTheFunctionItIsWrittenIn) {
+  static_assert(
+      IsFunction("void TarnCtl::Network::PortGroupImpl::SetVlanId(uint16_t)", "SetVlanId"));
+  static_assert(
+      IsFunction("TarnCtl::Network::PortGroupImpl::PortGroupImpl(const string&)", "PortGroupImpl"));
+  static_assert(IsFunction("int NODI_CheckSig(NODI_SigResult*, int, uint32_t*)", "NODI_CheckSig"));
+  static_assert(!IsFunction("void X::GetVlanIdentity()", "GetVlanId"));
+  static_assert(!IsFunction("void X::ResetVlanId(int)", "SetVlanId"));
+}
+
+// A trace file that cannot be opened or written turns the trace off, with
+// a line on standard error, and never blocks: a FIFO without a reader.
+TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
+  char pattern[] = "/tmp/trace-test-XXXXXX";
+  ASSERT_NE(mkdtemp(pattern), nullptr);
+  const std::string fifo = std::string(pattern) + "/fifo";
+  ASSERT_EQ(mkfifo(fifo.c_str(), 0644), 0);
+  for (const std::string& path : {fifo, std::string(pattern), std::string("/dev/full")}) {
+    setenv("TARN_TRACE", path.c_str(), 1);
+    testing::internal::CaptureStderr();
+    const bool on = TraceOn() && (WriteTraceLine("Refresh()"), TraceOn());
+    const std::string said = testing::internal::GetCapturedStderr();
+    EXPECT_FALSE(on) << path;
+    EXPECT_EQ(said.rfind("Call trace " + path + ": cannot ", 0), 0u) << said;
+    EXPECT_NE(said.find("calls are not traced\n"), std::string::npos) << said;
+  }
+  // A name cannot forge a second line: the target is escaped too.
+  const std::string file = std::string(pattern) + "/trace";
+  setenv("TARN_TRACE", file.c_str(), 1);
+  {
+    Call call(nullptr, Op::kGetVlanId, On("pg\nRemovePortGroup(\"x\") on vswitch0"),
+              [] { return std::string(); });
+  }
+  unsetenv("TARN_TRACE");
+  std::ifstream in(file);
+  std::string line, rest;
+  std::getline(in, line);
+  EXPECT_EQ(line, "GetVlanId() on pg\\nRemovePortGroup(\\\"x\\\") on vswitch0");
+  EXPECT_FALSE(std::getline(in, rest));
+  std::filesystem::remove_all(pattern);
+}
+
+}  // namespace

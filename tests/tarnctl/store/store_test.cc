@@ -1,0 +1,269 @@
+// The host file below the library: where it lives, what is refused without
+// being touched, creation in place, the lock on the file whatever path
+// reaches it, transactions, and the reset from the known schema.
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+
+#include "tarnctl/store/host_file.h"
+#include "tarnctl/store/pnics.h"
+#include "tarnctl/store/policy_codec.h"
+#include "tarnctl/store/reset.h"
+#include "tarnctl/store/rows.h"
+#include "tarnctl/store/transaction.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+using HostCtl::Lib::HostCtlException;
+using namespace TarnCtl::Store;
+
+class StoreTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    char pattern[] = "/tmp/store-test-XXXXXX";
+    ASSERT_NE(mkdtemp(pattern), nullptr);
+    dir_ = pattern;
+  }
+  void TearDown() override { fs::remove_all(dir_); }
+
+  std::string Path(const std::string& name) const { return dir_ + "/" + name; }
+  static std::unique_ptr<HostFile> Open(const std::string& path, int lockTimeout = 0) {
+    return HostFile::Open(Location::File(path), {lockTimeout, true});
+  }
+  static std::string Refusal(const std::function<void()>& body) {
+    try {
+      body();
+    } catch (const HostCtlException& e) {
+      return e.GetMessage();
+    }
+    return "";
+  }
+  static std::string Bytes(const std::string& path) {
+    std::ifstream in(path, std::ios::binary);
+    std::stringstream bytes;
+    bytes << in.rdbuf();
+    return bytes.str();
+  }
+  // The names in the directory, sorted.
+  std::vector<std::string> Listing() const {
+    std::vector<std::string> names;
+    for (const auto& entry : fs::directory_iterator(dir_)) {
+      names.push_back(entry.path().filename());
+    }
+    std::sort(names.begin(), names.end());
+    return names;
+  }
+  // Runs `body` in a child process; its exit status.
+  static int InChild(const std::function<int()>& body) {
+    const pid_t pid = fork();
+    if (pid == 0) _exit(body());
+    int status = 0;
+    waitpid(pid, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+  }
+
+  std::string dir_;
+};
+
+TEST_F(StoreTest, LocationFollowsTheEnvironment) {
+  const struct {
+    Environment environment;
+    const char* path;
+  } cases[] = {
+      {{"/x/h.db", "/state", "/home/u", true}, "/x/h.db"},
+      {{"", "/state", "/home/u", true}, "/var/lib/tarnhost/host.db"},
+      {{nullptr, "/state", "/home/u", false}, "/state/tarnhost/host.db"},
+      {{nullptr, "relative", "/home/u", false}, "/home/u/.local/state/tarnhost/host.db"},
+      {{nullptr, nullptr, nullptr, false}, "./.local/state/tarnhost/host.db"},
+  };
+  for (const auto& c : cases) EXPECT_EQ(ResolveLocation(c.environment).path, c.path);
+  EXPECT_EQ(Refusal([] {
+              ResolveLocation({"~/h.db", nullptr, "/home/u", false});
+            }),
+            "TARN_HOST_DB=~/h.db starts with \"~\", which only a shell expands; write the full "
+            "path (for example TARN_HOST_DB=$HOME/h.db)");
+}
+
+TEST_F(StoreTest, AMissingOrEmptyFileBecomesTheDefaultHostInPlace) {
+  const std::string missing = Path("sub/dir/host.db");
+  const std::string empty = Path("empty.db");
+  std::ofstream{empty};
+  for (const auto& path : {missing, empty}) {
+    auto host = Open(path);
+    EXPECT_TRUE(host->created()) << path;
+    EXPECT_EQ(Pnics::Names(host->db()).size(), 4u);
+  }
+  EXPECT_FALSE(Open(missing)->created());
+  // Nothing but the host files themselves: no lock files, no journals.
+  EXPECT_EQ(Listing(), (std::vector<std::string>{"empty.db", "sub"}));
+  EXPECT_EQ(
+      Refusal([&] {
+        HostFile::Open(Location::File(Path("none.db")), {0, false});
+      }),
+      "Cannot open host database " + Path("none.db") + ": no host yet (tarnhost init makes one)");
+}
+
+// What is not a host of this library is refused as it is: its bytes stay,
+// its leftover journal or log is not replayed, nothing appears beside it,
+// and a FIFO does not hang the opening.
+TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
+  Open(Path("host.db"));
+  auto other = Db::OpenFile(Path("host.db"), "host");  // an SQLite file of another program
+  fs::copy(Path("host.db"), Path("foreign.db"));
+  {
+    auto foreign = Db::OpenFile(Path("foreign.db"), "foreign");
+    foreign->Exec(
+        "PRAGMA application_id=7; PRAGMA journal_mode=WAL; CREATE TABLE t(x);"
+        "PRAGMA wal_autocheckpoint=0; INSERT INTO t VALUES (1)");
+    fs::copy(Path("foreign.db-wal"), Path("saved-wal"));  // left behind as by a crash
+  }
+  fs::copy(Path("saved-wal"), Path("foreign.db-wal"), fs::copy_options::overwrite_existing);
+  fs::copy(Path("host.db"), Path("newer.db"));
+  Db::OpenFile(Path("newer.db"), "newer")->Exec("PRAGMA user_version=9");
+  std::ofstream(Path("text.db")) << std::string(300, 't');
+  std::ofstream(Path("short.db")) << std::string("SQLite format 3\0\x10\0", 19);
+  fs::create_directory(Path("dir.db"));
+  ASSERT_EQ(mkfifo(Path("fifo.db").c_str(), 0644), 0);
+
+  const struct {
+    const char* name;
+    const char* cause;
+  } cases[] = {
+      {"foreign.db", "not a host database (application id 0x7)"},
+      {"newer.db", "schema version 9 is newer than this library's 1"},
+      {"text.db", "not a host database (not an SQLite database)"},
+      {"short.db", "not a host database (truncated header)"},
+      {"dir.db", "is a directory"},
+      {"fifo.db", "is not a regular file"},
+  };
+  const auto before = Listing();
+  for (const auto& c : cases) {
+    const std::string path = Path(c.name);
+    const std::string bytes = fs::is_regular_file(path) ? Bytes(path) : "";
+    EXPECT_EQ(Refusal([&] { Open(path); }), "Cannot open host database " + path + ": " + c.cause);
+    if (fs::is_regular_file(path)) {
+      EXPECT_EQ(Bytes(path), bytes) << c.name;
+    }
+  }
+  EXPECT_EQ(Bytes(Path("foreign.db-wal")), Bytes(Path("saved-wal")));
+  EXPECT_EQ(Listing(), before);
+}
+
+// One lock per file: a symbolic link and a hard link reach the same lock,
+// and SQLite always opens the file by one name (so its journal is shared).
+TEST_F(StoreTest, EveryPathToTheFileSharesItsLock) {
+  auto held = Open(Path("host.db"));
+  fs::create_symlink(Path("host.db"), Path("alias.db"));
+  fs::create_hard_link(Path("host.db"), Path("hard.db"));
+  for (const char* name : {"host.db", "alias.db", "hard.db"}) {
+    const std::string path = Path(name);
+    EXPECT_EQ(InChild([&] {
+                return Refusal([&] { Open(path); }) ==
+                               "Host " + path + " is busy: another process holds its lock"
+                           ? 0
+                           : 1;
+              }),
+              0)
+        << name;
+  }
+  held.reset();
+  // A hard link elsewhere could not share SQLite's journal: refused.
+  fs::create_directory(Path("elsewhere"));
+  fs::create_hard_link(Path("host.db"), Path("elsewhere/far.db"));
+  EXPECT_NE(Refusal([&] { Open(Path("hard.db")); }).find("hard link in another directory"),
+            std::string::npos);
+}
+
+// The busy timeout is set before anything is read: a program holding an
+// SQLite transaction on the file only delays the opening.
+TEST_F(StoreTest, AnotherConnectionsTransactionIsWaitedFor) {
+  Open(Path("host.db"));
+  int ready[2];
+  ASSERT_EQ(pipe(ready), 0);
+  const pid_t pid = fork();
+  if (pid == 0) {
+    auto other = Db::OpenFile(Path("host.db"), "other");
+    other->Exec("BEGIN EXCLUSIVE; DELETE FROM pnic WHERE name = 'pnic3'");
+    (void)write(ready[1], "x", 1);
+    usleep(300 * 1000);
+    other->Exec("COMMIT");
+    _exit(0);
+  }
+  char byte;
+  ASSERT_EQ(read(ready[0], &byte, 1), 1);
+  auto host = Open(Path("host.db"));
+  EXPECT_EQ(Pnics::Names(host->db()).size(), 3u);
+  waitpid(pid, nullptr, 0);
+}
+
+TEST_F(StoreTest, TransactionsNestAndUndoWhole) {
+  {
+    auto host = Open(Path("host.db"));
+    Db& db = host->db();
+    Transaction outer(db);
+    Pnics::Insert(db, "kept", 100);
+    {
+      Transaction inner(db);
+      Pnics::Insert(db, "dropped", 101);
+    }
+    {
+      Transaction inner(db);
+      Pnics::Insert(db, "inner", 102);
+      inner.Commit();
+    }
+    outer.Commit();
+    Transaction undone(db);
+    Pnics::Insert(db, "undone", 103);
+  }
+  auto host = Open(Path("host.db"));
+  EXPECT_EQ(Pnics::Names(host->db()),
+            (std::vector<std::string>{"pnic0", "pnic1", "pnic2", "pnic3", "kept", "inner"}));
+  // A failing statement names the file.
+  EXPECT_EQ(Refusal([&] { Pnics::Insert(host->db(), "pnic0", 200); }),
+            "Host database " + Path("host.db") + ": UNIQUE constraint failed: pnic.name");
+}
+
+// A reset builds the host from the library's own schema, whatever tables
+// the file holds: none is named into SQL from the file.
+TEST_F(StoreTest, RebuildUsesOnlyTheKnownSchema) {
+  auto schema = [](Db& db) {
+    std::vector<std::string> names;
+    auto select = db.Prepare("SELECT name FROM sqlite_schema ORDER BY name");
+    while (select.Step()) names.push_back(select.Text(0));
+    return names;
+  };
+  auto host = Open(Path("host.db"));
+  Db& db = host->db();
+  db.Exec("DROP TABLE link; CREATE TABLE \"pnic\"\"; CREATE TABLE survivor(x); --\"(x)");
+  Transaction transaction(db);
+  Reset::Rebuild(db, false);
+  transaction.Commit();
+  EXPECT_EQ(schema(db), schema(HostFile::Open(Location::Memory(), {})->db()));
+  EXPECT_EQ(Pnics::Names(db).size(), 4u);
+}
+
+TEST_F(StoreTest, PoliciesKeepEveryFieldAndRefuseMalformedText) {
+  HostCtl::Network::NicTeamingPolicy policy;
+  policy.flags = ~0ull;
+  policy.balancing = 65535;
+  policy.linkCriteria.errorPercent = 7;
+  policy.uplinkOrder = {"a", "b"};
+  policy.maxActive = -3;
+  const auto back = DecodeTeamingPolicy(EncodeTeamingPolicy(policy));
+  EXPECT_EQ(PolicyToJson(back, PolicyForm::kFull), PolicyToJson(policy, PolicyForm::kFull));
+  EXPECT_EQ(EncodeTeamingPolicy({}), "{}");
+  for (const char* text : {"[]", "{\"balancing\":65536}", "{\"maxActive\":\"1\"}", "{"}) {
+    EXPECT_EQ(Refusal([&] { DecodeTeamingPolicy(text); }), "Stored teaming policy is malformed")
+        << text;
+  }
+  EXPECT_THROW(PolicyFromJson(Json::object(), PolicyForm::kFull), FormatError);
+}
+
+}  // namespace
