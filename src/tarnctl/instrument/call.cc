@@ -32,10 +32,10 @@ Target Of(const std::string& record) {
 Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault)
     : db_(db), previous_(g_running) {
   const Operation& operation = Describe(op);
-  g_running = operation.name;
+  g_running = operation.name.c_str();
   if (db_ != nullptr) {
     previousContext_ = db_->context();
-    db_->set_context(operation.name);
+    db_->set_context(g_running);
   }
   if (TraceOn()) {
     std::string line = target.scope + operation.name + '(' + args + ')';
@@ -47,7 +47,7 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   }
   if (db_ == nullptr) return;
   try {
-    auto fault = TakeFault(*db_, operation.name, target.names);
+    auto fault = TakeFault(*db_, g_running, target.names);
     if (!fault) return;
     if (onFault == OnFault::kReport) {
       failed_ = true;

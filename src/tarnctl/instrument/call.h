@@ -105,15 +105,31 @@ constexpr bool IsFunction(std::string_view function, std::string_view operation)
 
 }  // namespace TarnCtl::Instrument
 
+// The registered operation `op`; does not compile for an unknown one.
+#define TARN_OPERATION(op)                                            \
+  [] {                                                                \
+    constexpr int index = ::TarnCtl::Instrument::OperationIndex(#op); \
+    static_assert(index >= 0, "operation " #op " is not registered"); \
+    return static_cast<::TarnCtl::Instrument::Op>(index);             \
+  }()
+
+// The registered operation `op`; does not compile for an unknown one.
+#define TARN_OPERATION(op)                                            \
+  [] {                                                                \
+    constexpr int index = ::TarnCtl::Instrument::OperationIndex(#op); \
+    static_assert(index >= 0, "operation " #op " is not registered"); \
+    return static_cast<::TarnCtl::Instrument::Op>(index);             \
+  }()
+
 #define TARN_CHECK_OPERATION(op)                                                               \
   static_assert(                                                                               \
       ::TarnCtl::Instrument::IsFunction(std::source_location::current().function_name(), #op), \
       "operation " #op " is not the function it is written in")
 
-#define TARN_CALL(db, op, target, ...)                                                           \
-  TARN_CHECK_OPERATION(op);                                                                      \
-  ::TarnCtl::Instrument::Call tarn_call_((db), ::TarnCtl::Instrument::Op::k##op, (target), [&] { \
-    return ::TarnCtl::Instrument::FormatArgs(__VA_ARGS__);                                       \
+#define TARN_CALL(db, op, target, ...)                                             \
+  TARN_CHECK_OPERATION(op);                                                        \
+  ::TarnCtl::Instrument::Call tarn_call_((db), TARN_OPERATION(op), (target), [&] { \
+    return ::TarnCtl::Instrument::FormatArgs(__VA_ARGS__);                         \
   })
 
 // The same for calls that must not throw: a fault only sets
@@ -121,7 +137,7 @@ constexpr bool IsFunction(std::string_view function, std::string_view operation)
 #define TARN_CALL_REPORTING(db, op, target, ...)                      \
   TARN_CHECK_OPERATION(op);                                           \
   ::TarnCtl::Instrument::Call tarn_call_(                             \
-      (db), ::TarnCtl::Instrument::Op::k##op, (target),               \
+      (db), TARN_OPERATION(op), (target),                             \
       [&] { return ::TarnCtl::Instrument::FormatArgs(__VA_ARGS__); }, \
       ::TarnCtl::Instrument::Call::OnFault::kReport)
 

@@ -31,14 +31,40 @@ size_t Distance(std::string_view a, std::string_view b) {
   return row[b.size()];
 }
 
+// The names of a space-separated list.
+std::vector<std::string_view> Words(std::string_view list) {
+  std::vector<std::string_view> words;
+  for (size_t at = 0; at < list.size();) {
+    size_t end = list.find(' ', at);
+    if (end == std::string_view::npos) end = list.size();
+    words.push_back(list.substr(at, end - at));
+    at = end + 1;
+  }
+  return words;
+}
+
+bool Contains(std::string_view list, std::string_view name) {
+  for (const auto word : Words(list)) {
+    if (word == name) return true;
+  }
+  return false;
+}
+
 }  // namespace
 
 const std::vector<Operation>& Operations() {
-  static const std::vector<Operation> operations = {
-#define TARN_OPERATION_ROW(name, targets, faultable) {Op::k##name, #name, targets, faultable},
-      TARN_OPERATIONS(TARN_OPERATION_ROW)
-#undef TARN_OPERATION_ROW
-  };
+  static const std::vector<Operation> operations = [] {
+    std::vector<Operation> all;
+    for (const auto name : Words(kOperationNames)) {
+      unsigned targets = kNoTarget;
+      for (const TargetList& list : kTargetLists) {
+        if (Contains(list.operations, name)) targets |= list.kinds;
+      }
+      all.push_back(
+          {static_cast<Op>(all.size()), std::string(name), targets, !Contains(kUnfaultable, name)});
+    }
+    return all;
+  }();
   return operations;
 }
 

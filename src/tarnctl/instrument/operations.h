@@ -2,7 +2,7 @@
 // writes it and as faults name it) and what a fault's target (`--on`) may
 // name for it. Every library entry point declares its operation with
 // TARN_CALL (call.h), which refuses to compile when the operation is not
-// the function it stands in.
+// registered or is not the function it is written in.
 #pragma once
 
 #include <optional>
@@ -25,91 +25,70 @@ enum TargetKind : unsigned {
   kAnySwitch = kStandardSwitch | kDistributedSwitch | kOpaqueSwitch,
 };
 
-// X(name, targets, faultable): every operation, in name order.
-#define TARN_OPERATIONS(X)                                        \
-  X(ActivateEns, kAnySwitch, true)                                \
-  X(AddDVPortUplink, kDistributedSwitch | kOpaqueSwitch, true)    \
-  X(AddDVSwitch, kNameArgument, true)                             \
-  X(AddPortGroup, kStandardSwitch, true)                          \
-  X(AddUplink, kStandardSwitch, true)                             \
-  X(AddVirtualSwitch, kNameArgument, true)                        \
-  X(DVPortImpl, kNameArgument, true)                              \
-  X(DeactivateEns, kAnySwitch, true)                              \
-  X(GetAllPortGroupNames, kNoTarget, true)                        \
-  X(GetCdpStatus, kStandardSwitch, true)                          \
-  X(GetConfiguredPorts, kAnySwitch, true)                         \
-  X(GetConnectionId, kDVPort, true)                               \
-  X(GetDVPortParams, kDistributedSwitch | kOpaqueSwitch, true)    \
-  X(GetDVPorts, kDistributedSwitch | kOpaqueSwitch, true)         \
-  X(GetDVSwitchByName, kNameArgument, true)                       \
-  X(GetDVSwitchId, kDistributedSwitch | kOpaqueSwitch, true)      \
-  X(GetDVSwitches, kNoTarget, true)                               \
-  X(GetDefaultPolicy, kRecord, true)                              \
-  X(GetEnsMode, kAnySwitch, true)                                 \
-  X(GetIntParamList, kNoTarget, true)                             \
-  X(GetLagTimeoutConfig, kNameArgument, true)                     \
-  X(GetMTU, kAnySwitch, true)                                     \
-  X(GetName, kAnySwitch | kPortGroup, true)                       \
-  X(GetNumPorts, kAnySwitch, true)                                \
-  X(GetOpaqueSwitches, kNoTarget, true)                           \
-  X(GetParam, kDVPort, true)                                      \
-  X(GetPortGroups, kStandardSwitch, true)                         \
-  X(GetPortId, kDVPort, true)                                     \
-  X(GetPorts, kPortGroup, true)                                   \
-  X(GetPortsetById, kNameArgument, true)                          \
-  X(GetSwitchName, kDistributedSwitch | kOpaqueSwitch, true)      \
-  X(GetTeamingPolicy, kStandardSwitch | kPortGroup, true)         \
-  X(GetUplinkTimeoutConfig, kNameArgument, true)                  \
-  X(GetUplinks, kAnySwitch, true)                                 \
-  X(GetUsedPorts, kAnySwitch, true)                               \
-  X(GetVirtualSwitchById, kNameArgument, true)                    \
-  X(GetVirtualSwitchInfo, kNoTarget, true)                        \
-  X(GetVirtualSwitches, kNoTarget, true)                          \
-  X(GetVlanId, kPortGroup, true)                                  \
-  X(IsInUse, kDVPort, true)                                       \
-  X(IsValid, kDVPort, true)                                       \
-  X(IsValidPortGroup, kNameArgument, true)                        \
-  X(IsValidVirtualSwitch, kNameArgument, true)                    \
-  X(LoadLagTimeoutConfig, kNameArgument, true)                    \
-  X(LoadUplinkTimeoutConfig, kNameArgument, true)                 \
-  X(NODI_CheckSig, kNoTarget, true)                               \
-  X(NODI_ParamListDestroy, kNoTarget, false)                      \
-  X(NODI_Set, kNoTarget, true)                                    \
-  X(NetworkInfoImpl, kNoTarget, true)                             \
-  X(ParseCdpStatus, kNameArgument, true)                          \
-  X(PortGroupImpl, kNameArgument, true)                           \
-  X(ReassociateEnsUplinks, kAnySwitch, true)                      \
-  X(Refresh, kNoTarget, true)                                     \
-  X(RemoveDVPortUplink, kDistributedSwitch | kOpaqueSwitch, true) \
-  X(RemovePortGroup, kStandardSwitch, true)                       \
-  X(RemoveUplink, kStandardSwitch, true)                          \
-  X(RemoveVirtualSwitch, kNameArgument, true)                     \
-  X(RestoreDVSwitches, kNameArgument, true)                       \
-  X(RestoreUplinks, kStandardSwitch, true)                        \
-  X(RestoreVirtualSwitches, kNoTarget, true)                      \
-  X(SetCdpStatus, kStandardSwitch, true)                          \
-  X(SetConnectionId, kDVPort, true)                               \
-  X(SetMTU, kAnySwitch, true)                                     \
-  X(SetMaxActiveUplinks, kNoTarget, true)                         \
-  X(SetTeamingPolicy, kStandardSwitch | kPortGroup, true)         \
-  X(SetUplinkOrder, kNoTarget, true)                              \
-  X(SetVlanId, kPortGroup, true)                                  \
-  X(SwitchExists, kNameArgument, true)                            \
-  X(TARN_ReturnStatusToString, kNoTarget, false)                  \
-  X(TestDVPortNota, kDVPort, true)                                \
-  X(VirtualSwitchInfoImpl, kNoTarget, true)
+// Every operation, in name order, one space between names.
+inline constexpr std::string_view kOperationNames =
+    "ActivateEns AddDVPortUplink AddDVSwitch AddPortGroup AddUplink AddVirtualSwitch "
+    "DVPortImpl DeactivateEns GetAllPortGroupNames GetCdpStatus GetConfiguredPorts "
+    "GetConnectionId GetDVPortParams GetDVPorts GetDVSwitchByName GetDVSwitchId GetDVSwitches "
+    "GetDefaultPolicy GetEnsMode GetIntParamList GetLagTimeoutConfig GetMTU GetName "
+    "GetNumPorts GetOpaqueSwitches GetParam GetPortGroups GetPortId GetPorts GetPortsetById "
+    "GetSwitchName GetTeamingPolicy GetUplinkTimeoutConfig GetUplinks GetUsedPorts "
+    "GetVirtualSwitchById GetVirtualSwitchInfo GetVirtualSwitches GetVlanId IsInUse IsValid "
+    "IsValidPortGroup IsValidVirtualSwitch LoadLagTimeoutConfig LoadUplinkTimeoutConfig "
+    "NODI_CheckSig NODI_ParamListDestroy NODI_Set NetworkInfoImpl ParseCdpStatus "
+    "PortGroupImpl ReassociateEnsUplinks Refresh RemoveDVPortUplink RemovePortGroup "
+    "RemoveUplink RemoveVirtualSwitch RestoreDVSwitches RestoreUplinks RestoreVirtualSwitches "
+    "SetCdpStatus SetConnectionId SetMTU SetMaxActiveUplinks SetTeamingPolicy SetUplinkOrder "
+    "SetVlanId SwitchExists TARN_ReturnStatusToString TestDVPortNota VirtualSwitchInfoImpl";
 
-enum class Op {
-#define TARN_OPERATION_ENUM(name, targets, faultable) k##name,
-  TARN_OPERATIONS(TARN_OPERATION_ENUM)
-#undef TARN_OPERATION_ENUM
+// The operations whose targets are of each kind (an operation on more than
+// one kind of object is in more than one list); the others have none.
+struct TargetList {
+  unsigned kinds;
+  std::string_view operations;
 };
+inline constexpr TargetList kTargetLists[] = {
+    {kAnySwitch,
+     "ActivateEns DeactivateEns GetConfiguredPorts GetEnsMode GetMTU GetName GetNumPorts "
+     "GetUplinks GetUsedPorts ReassociateEnsUplinks SetMTU"},
+    {kStandardSwitch,
+     "AddPortGroup AddUplink GetCdpStatus GetPortGroups GetTeamingPolicy RemovePortGroup "
+     "RemoveUplink RestoreUplinks SetCdpStatus SetTeamingPolicy"},
+    {kDistributedSwitch | kOpaqueSwitch,
+     "AddDVPortUplink GetDVPortParams GetDVPorts GetDVSwitchId GetSwitchName "
+     "RemoveDVPortUplink"},
+    {kPortGroup, "GetName GetPorts GetTeamingPolicy GetVlanId SetTeamingPolicy SetVlanId"},
+    {kDVPort, "GetConnectionId GetParam GetPortId IsInUse IsValid SetConnectionId TestDVPortNota"},
+    {kNameArgument,
+     "AddDVSwitch AddVirtualSwitch DVPortImpl GetDVSwitchByName GetLagTimeoutConfig "
+     "GetPortsetById GetUplinkTimeoutConfig GetVirtualSwitchById IsValidPortGroup "
+     "IsValidVirtualSwitch LoadLagTimeoutConfig LoadUplinkTimeoutConfig ParseCdpStatus "
+     "PortGroupImpl RemoveVirtualSwitch RestoreDVSwitches SwitchExists"},
+    {kRecord, "GetDefaultPolicy"},
+};
+
+// Calls made without a host: they can never fail on purpose.
+inline constexpr std::string_view kUnfaultable = "NODI_ParamListDestroy TARN_ReturnStatusToString";
+
+// The position of `name` in kOperationNames, or -1.
+constexpr int OperationIndex(std::string_view name) {
+  int index = 0;
+  for (size_t at = 0; at < kOperationNames.size(); ++index) {
+    size_t end = kOperationNames.find(' ', at);
+    if (end == std::string_view::npos) end = kOperationNames.size();
+    if (kOperationNames.substr(at, end - at) == name) return index;
+    at = end + 1;
+  }
+  return -1;
+}
+
+// An operation, by its position in kOperationNames.
+enum class Op : int {};
 
 struct Operation {
   Op op;
-  const char* name;
+  std::string name;
   unsigned targets;  // TargetKind bits
-  // False for calls made without a host (they can never fail on purpose).
   bool faultable;
 };
 

@@ -172,6 +172,12 @@ void Db::Fail() const {
   throw Error(handle_ != nullptr ? sqlite3_errmsg(handle_) : "out of memory");
 }
 
+Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string& name) {
+  auto statement = db.Prepare(sql);
+  statement.Bind(1, layer).Bind(2, name);
+  return statement;
+}
+
 // --- Transaction ---
 
 Transaction::Transaction(Db& db) : db_(db), depth_(db.depth_) {

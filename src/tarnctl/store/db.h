@@ -113,4 +113,8 @@ class Db {
   std::unique_ptr<Cache> cache_;
 };
 
+// `sql` with its first two parameters bound to a layer and a name: the key
+// of most rows.
+Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string& name);
+
 }  // namespace TarnCtl::Store

@@ -20,17 +20,18 @@ Row ReadRow(const Statement& select, int first) {
 
 std::optional<std::string> NameWhere(Db& db, const char* sql, Layer layer,
                                      const std::string& value) {
-  auto select = db.Prepare(sql);
-  if (!select.Bind(1, LayerValue(layer)).Bind(2, value).Step()) return std::nullopt;
+  auto select = Keyed(db, sql, LayerValue(layer), value);
+  if (!select.Step()) return std::nullopt;
   return select.Text(0);
 }
 
 }  // namespace
 
 std::optional<Row> Find(Db& db, Layer layer, const std::string& name) {
-  auto select = db.Prepare(std::string("SELECT ") + kRowColumns +
-                           " FROM dvswitch WHERE layer = ? AND name = ?");
-  if (!select.Bind(1, LayerValue(layer)).Bind(2, name).Step()) return std::nullopt;
+  auto select = Keyed(
+      db, std::string("SELECT ") + kRowColumns + " FROM dvswitch WHERE layer = ?1 AND name = ?2",
+      LayerValue(layer), name);
+  if (!select.Step()) return std::nullopt;
   return ReadRow(select, 0);
 }
 

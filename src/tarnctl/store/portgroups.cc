@@ -6,15 +6,15 @@ namespace TarnCtl::Store::PortGroups {
 
 std::optional<Row> Find(Db& db, Layer layer, const std::string& name) {
   auto select =
-      db.Prepare("SELECT switch, vlan, policy FROM portgroup WHERE layer = ? AND name = ?");
-  if (!select.Bind(1, LayerValue(layer)).Bind(2, name).Step()) return std::nullopt;
+      Keyed(db, "SELECT switch, vlan, policy FROM portgroup WHERE layer = ?1 AND name = ?2",
+            LayerValue(layer), name);
+  if (!select.Step()) return std::nullopt;
   return Row{select.Text(0), static_cast<uint16_t>(select.Int(1)), select.Text(2)};
 }
 
 bool Exists(Db& db, Layer layer, const std::string& name) {
-  return db.Prepare("SELECT 1 FROM portgroup WHERE layer = ? AND name = ?")
-      .Bind(1, LayerValue(layer))
-      .Bind(2, name)
+  return Keyed(db, "SELECT 1 FROM portgroup WHERE layer = ?1 AND name = ?2", LayerValue(layer),
+               name)
       .Step();
 }
 

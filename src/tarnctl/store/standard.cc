@@ -27,16 +27,15 @@ std::vector<Named> ReadNamed(Statement& select) {
 }  // namespace
 
 std::optional<Row> Find(Db& db, Layer layer, const std::string& name) {
-  auto select = db.Prepare(std::string("SELECT ") + kRowColumns +
-                           " FROM vswitch WHERE layer = ? AND name = ?");
-  if (!select.Bind(1, LayerValue(layer)).Bind(2, name).Step()) return std::nullopt;
+  auto select = Keyed(
+      db, std::string("SELECT ") + kRowColumns + " FROM vswitch WHERE layer = ?1 AND name = ?2",
+      LayerValue(layer), name);
+  if (!select.Step()) return std::nullopt;
   return ReadRow(select, 0);
 }
 
 bool Exists(Db& db, Layer layer, const std::string& name) {
-  return db.Prepare("SELECT 1 FROM vswitch WHERE layer = ? AND name = ?")
-      .Bind(1, LayerValue(layer))
-      .Bind(2, name)
+  return Keyed(db, "SELECT 1 FROM vswitch WHERE layer = ?1 AND name = ?2", LayerValue(layer), name)
       .Step();
 }
 

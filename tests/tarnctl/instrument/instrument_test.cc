@@ -8,6 +8,7 @@
 
 #include <filesystem>
 #include <fstream>
+#include <sstream>
 
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/operations.h"
@@ -36,6 +37,13 @@ TEST(OperationsTest, OneEntryPerNameInNameOrder) {
   for (const auto& c : cases) {
     EXPECT_EQ(NearestOperation(c.given).value_or(""), c.nearest) << c.given;
   }
+  // The target lists and the unfaultable calls name registered operations.
+  for (const TargetList& list : kTargetLists) {
+    std::istringstream names{std::string(list.operations)};
+    for (std::string name; names >> name;) EXPECT_NE(FindOperation(name), nullptr) << name;
+  }
+  EXPECT_FALSE(FindOperation("TARN_ReturnStatusToString")->faultable);
+  EXPECT_EQ(FindOperation("SetTeamingPolicy")->targets, kStandardSwitch | kPortGroup);
   EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
 }
 
@@ -69,7 +77,7 @@ TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
   const std::string file = std::string(pattern) + "/trace";
   setenv("TARN_TRACE", file.c_str(), 1);
   {
-    Call call(nullptr, Op::kGetVlanId, On("pg\nRemovePortGroup(\"x\") on vswitch0"),
+    Call call(nullptr, TARN_OPERATION(GetVlanId), On("pg\nRemovePortGroup(\"x\") on vswitch0"),
               [] { return std::string(); });
   }
   unsetenv("TARN_TRACE");
