@@ -138,6 +138,12 @@ of the command, or a hint where none is known, on standard error; status 2.
   $ ls
   help
 
+The completion (asking tarnhost) offers exactly, and the man page lists
+exactly, the commands and options of the table as the usage shows it.
+
+  $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
+  18 commands, 18 options compared
+
 The default host as a dump.
 
   $ tarnhost dump | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
