@@ -12,6 +12,10 @@ const OptionSpec* Syntax::Option(const std::string& name) const {
   return nullptr;
 }
 
+std::string OptionSpec::Usage() const {
+  return "--" + std::string(name) + (TakesValue() ? " " + std::string(value) : "");
+}
+
 std::string Syntax::Synopsis() const {
   std::string text;
   auto add = [&](const std::string& part) { text += (text.empty() ? "" : " ") + part; };
@@ -20,14 +24,23 @@ std::string Syntax::Synopsis() const {
     add(a.optional ? "[" + name + "]" : name);
   }
   for (const auto& o : options) {
-    const std::string value = o.TakesValue() ? std::string(" ") + o.value : "";
-    add("[--" + std::string(o.name) + value + "]" + (o.repeatable ? "..." : ""));
+    add("[" + o.Usage() + "]" + (o.repeatable ? "..." : ""));
   }
   return text;
 }
 
 bool IsOptionWord(const std::string& word) {
   return word.size() > 1 && word[0] == '-' && !(word[1] >= '0' && word[1] <= '9');
+}
+
+bool IsHelpWord(const std::string& word) {
+  return word == "-h" || word == "--help";
+}
+
+std::string Join(const std::vector<std::string>& words, const char* separator) {
+  std::string text;
+  for (const auto& w : words) text += (text.empty() ? "" : separator) + w;
+  return text;
 }
 
 Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
@@ -53,7 +66,7 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
       optionsEnded = true;
       continue;
     }
-    if (word == "-h" || word == "--help") {
+    if (IsHelpWord(word)) {
       help_ = true;
       continue;
     }

@@ -43,6 +43,7 @@ struct OptionSpec {
   Kind kind = Kind::Text;  // of its value
 
   bool TakesValue() const { return value != nullptr; }
+  std::string Usage() const;  // "--name VALUE"
 };
 
 struct ArgumentSpec {
@@ -87,6 +88,10 @@ class Args {
 // True when `word` is an option word: "-" (standard input) and negative
 // numbers are arguments.
 bool IsOptionWord(const std::string& word);
+// -h or --help.
+bool IsHelpWord(const std::string& word);
+// The words with `separator` between them.
+std::string Join(const std::vector<std::string>& words, const char* separator = " ");
 
 // Decimal digits only, no sign or blanks, within the type's range.
 int32_t ParseInt32(const std::string& text, const std::string& what);

@@ -64,20 +64,15 @@ void PrintHelp(const std::vector<const Command*>& commands, std::FILE* stream) {
     size_t width = 0;
     std::vector<std::string> names;
     for (const auto& o : c->syntax.options) {
-      names.push_back("--" + std::string(o.name) +
-                      (o.TakesValue() ? " " + std::string(o.value) : ""));
+      names.push_back(o.Usage());
       width = std::max(width, names.back().size());
     }
     for (size_t i = 0; i < names.size(); ++i) {
       text += Columns("  " + names[i], c->syntax.options[i].help, width + 4);
     }
-    std::string also;
-    for (const auto& spelling : c->also) {
-      std::string name;
-      for (const auto& w : spelling) name += (name.empty() ? "" : " ") + w;
-      also += (also.empty() ? "" : ", ") + name;
-    }
-    if (!also.empty()) text += Wrap("Also spelled: " + also + ".", 2);
+    Words also;
+    for (const auto& spelling : c->also) also.push_back(Join(spelling));
+    if (!also.empty()) text += Wrap("Also spelled: " + Join(also, ", ") + ".", 2);
     std::fputs(text.c_str(), stream);
   }
 }

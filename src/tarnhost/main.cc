@@ -42,9 +42,7 @@ int main(int argc, char** argv) {
     if (!command) {
       // -h or --help right after the first words of some commands: theirs.
       const size_t known = KnownPrefix(words);
-      const bool help =
-          known > 0 && known < words.size() && (words[known] == "-h" || words[known] == "--help");
-      if (!help) Explain(words);
+      if (known == 0 || known == words.size() || !IsHelpWord(words[known])) Explain(words);
       PrintHelp(Select(Words(words.begin(), words.begin() + known)), stdout);
       return Print("");
     }

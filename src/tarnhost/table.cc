@@ -37,9 +37,7 @@ std::vector<Words> Spellings(const Command& c) {
 }  // namespace
 
 std::string Command::Name() const {
-  std::string name;
-  for (const auto& w : words) name += (name.empty() ? "" : " ") + w;
-  return name;
+  return Join(words);
 }
 
 const std::vector<Command>& Commands() {
@@ -244,13 +242,10 @@ size_t KnownPrefix(const Words& words) {
   const size_t known = KnownPrefix(words);
   const Words prefix(words.begin(), words.begin() + known);
   const Words next = NextWords(prefix);
-  std::string before;
-  for (const auto& w : prefix) before += w + " ";
+  const std::string before = known == 0 ? "" : Join(prefix) + " ";
   if (known == words.size()) {
-    std::string choices;
-    for (const auto& w : next) choices += (choices.empty() ? "" : ", ") + w;
     throw CommandError(std::string("missing ") + (known == 1 ? "verb" : "word") + " after " +
-                           before + "(" + choices + ")",
+                           before + "(" + Join(next, ", ") + ")",
                        Select(prefix));
   }
   const std::string& word = words[known];
