@@ -1,17 +1,64 @@
 #include "tarnhost/args.h"
 
+#include <algorithm>
 #include <charconv>
 
 namespace TarnHost {
 
-Args::Args(const std::vector<std::string>& words, const std::vector<OptionSpec>& options,
-           size_t minPositional, size_t maxPositional) {
+const OptionSpec* Syntax::Option(const std::string& name) const {
+  for (const auto& o : options) {
+    if (name == o.name) return &o;
+  }
+  return nullptr;
+}
+
+std::string OptionSpec::Usage() const {
+  return "--" + std::string(name) + (TakesValue() ? " " + std::string(value) : "");
+}
+
+std::string Syntax::Synopsis() const {
+  std::string text;
+  auto add = [&](const std::string& part) { text += (text.empty() ? "" : " ") + part; };
+  for (const auto& a : arguments) {
+    const std::string name = std::string(a.name) + (a.repeats ? "..." : "");
+    add(a.optional ? "[" + name + "]" : name);
+  }
+  for (const auto& o : options) {
+    add("[" + o.Usage() + "]" + (o.repeatable ? "..." : ""));
+  }
+  return text;
+}
+
+bool IsOptionWord(const std::string& word) {
+  return word.size() > 1 && word[0] == '-' && !(word[1] >= '0' && word[1] <= '9');
+}
+
+bool IsHelpWord(const std::string& word) {
+  return word == "-h" || word == "--help";
+}
+
+std::string Join(const std::vector<std::string>& words, const char* separator) {
+  std::string text;
+  for (const auto& w : words) text += (text.empty() ? "" : separator) + w;
+  return text;
+}
+
+Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
+           const std::string& command) {
+  if (syntax.raw) {
+    positional_ = words;
+    return;
+  }
+  // The first mistake is reported, but only once every word was seen: a
+  // --help further on wins.
+  std::optional<std::string> mistake;
+  auto refuse = [&](const std::string& why) {
+    if (!mistake) mistake = why;
+  };
   bool optionsEnded = false;
   for (size_t i = 0; i < words.size(); ++i) {
     const std::string& word = words[i];
-    // "-" (standard input) and negative numbers are arguments, not options.
-    const bool option = word.size() > 1 && word[0] == '-' && !(word[1] >= '0' && word[1] <= '9');
-    if (optionsEnded || !option) {
+    if (optionsEnded || !IsOptionWord(word)) {
       positional_.push_back(word);
       continue;
     }
@@ -19,32 +66,50 @@ Args::Args(const std::vector<std::string>& words, const std::vector<OptionSpec>&
       optionsEnded = true;
       continue;
     }
-    if (word.compare(0, 2, "--") != 0) throw UsageError("unknown option " + word);
-    const auto eq = word.find('=');
-    const std::string name = word.substr(2, eq == std::string::npos ? std::string::npos : eq - 2);
-    const OptionSpec* known = nullptr;
-    for (const auto& o : options) {
-      if (name == o.name) known = &o;
+    if (IsHelpWord(word)) {
+      help_ = true;
+      continue;
     }
-    if (!known) throw UsageError("unknown option --" + name);
+    const auto eq = word.find('=');
+    const std::string name = word.substr(2, eq == std::string::npos ? eq : eq - 2);
+    const OptionSpec* known = word.compare(0, 2, "--") == 0 ? syntax.Option(name) : nullptr;
+    if (!known) {
+      std::vector<std::string> names;
+      for (const auto& o : syntax.options) names.push_back("--" + std::string(o.name));
+      const std::string given = word.substr(0, eq);
+      refuse("unknown option " + given + " for " + command + DidYouMean(given, names));
+      continue;
+    }
     std::string value;
-    if (known->takesValue) {
+    if (known->TakesValue()) {
       if (eq != std::string::npos) {
         value = word.substr(eq + 1);
       } else if (i + 1 < words.size()) {
         value = words[++i];
       } else {
-        throw UsageError("option --" + name + " needs a value");
+        refuse("option --" + name + " needs a value");
       }
     } else if (eq != std::string::npos) {
-      throw UsageError("option --" + name + " takes no value");
+      refuse("option --" + name + " takes no value");
     }
     auto& slot = values_[name];
-    if (!slot.empty() && !known->repeatable) throw UsageError("option --" + name + " given twice");
+    if (!slot.empty() && !known->repeatable) refuse("option --" + name + " given twice");
     slot.push_back(value);
   }
-  if (positional_.size() < minPositional) throw UsageError("missing arguments");
-  if (positional_.size() > maxPositional) throw UsageError("too many arguments");
+  if (help_) return;
+  if (mistake) throw UsageError(*mistake);
+  const auto& specs = syntax.arguments;
+  const size_t required =
+      std::count_if(specs.begin(), specs.end(), [](const ArgumentSpec& a) { return !a.optional; });
+  if (positional_.size() < required) {
+    std::string missing = "missing";
+    for (size_t k = positional_.size(); k < required; ++k)
+      missing += " " + std::string(specs[k].name);
+    throw UsageError(missing);
+  }
+  if (positional_.size() > specs.size() && (specs.empty() || !specs.back().repeats)) {
+    throw UsageError("unexpected argument " + positional_[specs.size()]);
+  }
 }
 
 std::optional<std::string> Args::Value(const std::string& option) const {
@@ -78,6 +143,23 @@ T ParseDecimal(const std::string& text, const std::string& what) {
   return value;
 }
 
+// Edits (insertion, deletion, substitution, swap of neighbours) from a to b.
+size_t Distance(const std::string& a, const std::string& b) {
+  std::vector<std::vector<size_t>> d(a.size() + 1, std::vector<size_t>(b.size() + 1));
+  for (size_t i = 0; i <= a.size(); ++i) d[i][0] = i;
+  for (size_t j = 0; j <= b.size(); ++j) d[0][j] = j;
+  for (size_t i = 1; i <= a.size(); ++i) {
+    for (size_t j = 1; j <= b.size(); ++j) {
+      d[i][j] = std::min(
+          {d[i - 1][j] + 1, d[i][j - 1] + 1, d[i - 1][j - 1] + (a[i - 1] == b[j - 1] ? 0 : 1)});
+      if (i > 1 && j > 1 && a[i - 1] == b[j - 2] && a[i - 2] == b[j - 1]) {
+        d[i][j] = std::min(d[i][j], d[i - 2][j - 2] + 1);
+      }
+    }
+  }
+  return d[a.size()][b.size()];
+}
+
 }  // namespace
 
 int32_t ParseInt32(const std::string& text, const std::string& what) {
@@ -101,6 +183,40 @@ std::vector<std::string> SplitNames(const std::string& text, const std::string& 
     if (comma == std::string::npos) return names;
     start = comma + 1;
   }
+}
+
+std::vector<std::string> Nearest(const std::string& word,
+                                 const std::vector<std::string>& candidates) {
+  std::vector<std::string> nearest;
+  if (word.size() >= 2) {  // a beginning names what it begins
+    for (const auto& c : candidates) {
+      if (c.size() > word.size() && c.compare(0, word.size(), word) == 0) nearest.push_back(c);
+    }
+    if (!nearest.empty()) return nearest;
+  }
+  size_t best = word.size() <= 4 ? 1 : 2;  // more edits than that is another word
+  for (const auto& c : candidates) {
+    const size_t d = Distance(word, c);
+    if (d < best) nearest.clear();
+    if (d <= best) {
+      best = d;
+      nearest.push_back(c);
+    }
+  }
+  return nearest;
+}
+
+std::string DidYouMean(const std::string& word, const std::vector<std::string>& candidates,
+                       const std::string& before) {
+  const auto nearest = Nearest(word, candidates);
+  std::string text;
+  for (size_t i = 0; i < nearest.size(); ++i) {
+    text += (i == 0                    ? "; did you mean "
+             : i + 1 == nearest.size() ? " or "
+                                       : ", ") +
+            before + nearest[i];
+  }
+  return text.empty() ? text : text + "?";
 }
 
 }  // namespace TarnHost

@@ -1,7 +1,8 @@
 // Command-line words of tarnhost after the command's own words: positional
 // arguments and --options (as "--name VALUE" or "--name=VALUE"; "--" ends
-// the options). Every mistake throws UsageError, which the caller answers
-// with the usage text and exit status 2.
+// the options; -h or --help asks for the command's help). Every mistake
+// throws UsageError, which the caller answers with the command's usage
+// lines and exit status 2.
 #pragma once
 
 #include <cstdint>
@@ -17,19 +18,61 @@ struct UsageError : std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
+// What a word names, for completion: the words that can stand there come
+// from tarnhost itself (command words, operation names), from the shell
+// (files), or, for the host's objects, from the host (not offered yet).
+enum class Kind {
+  Text,       // free text or a new name: nothing to offer
+  Number,     // decimal
+  File,       // a file, or - for standard input
+  Command,    // tarnhost's own command words
+  Operation,  // a library operation that a fault can make fail
+  Pnic,
+  PnicList,  // pnics separated by commas
+  PortGroup,
+  DVSwitch,
+  Portset,
+  Object,  // any named object: switch, portset, port group, DVPort id
+};
+
 struct OptionSpec {
-  const char* name;  // without the leading "--"
-  bool takesValue;
+  const char* name;             // without the leading "--"
+  const char* value = nullptr;  // placeholder of its value in usage text; none: a flag
   bool repeatable = false;
+  const char* help = "";
+  Kind kind = Kind::Text;  // of its value
+
+  bool TakesValue() const { return value != nullptr; }
+  std::string Usage() const;  // "--name VALUE"
+};
+
+struct ArgumentSpec {
+  const char* name;  // placeholder in usage text, e.g. PORTGROUP
+  Kind kind = Kind::Text;
+  bool optional = false;
+  bool repeats = false;  // the last argument only: any number of them
+};
+
+struct Syntax {
+  std::vector<ArgumentSpec> arguments = {};
+  std::vector<OptionSpec> options = {};
+  bool raw = false;  // every word is an argument: no options, no --help
+
+  const OptionSpec* Option(const std::string& name) const;
+  // The arguments and options as usage text shows them.
+  std::string Synopsis() const;
 };
 
 class Args {
  public:
-  // Splits `words` by `options`; refuses unknown or repeated options and a
-  // positional count outside [minPositional, maxPositional].
-  Args(const std::vector<std::string>& words, const std::vector<OptionSpec>& options,
-       size_t minPositional, size_t maxPositional);
+  // Splits `words` by `syntax`; refuses unknown or repeated options and
+  // missing or extra arguments, naming them and, in messages about
+  // options, `command`. When -h or --help is among the options, nothing is
+  // refused: the caller shows the help instead.
+  Args(const std::vector<std::string>& words, const Syntax& syntax, const std::string& command);
 
+  bool HelpRequested() const { return help_; }
+  const std::vector<std::string>& Positionals() const { return positional_; }
   const std::string& Positional(size_t index) const { return positional_.at(index); }
   bool Has(const std::string& option) const { return values_.count(option) > 0; }
   std::optional<std::string> Value(const std::string& option) const;
@@ -39,7 +82,16 @@ class Args {
  private:
   std::vector<std::string> positional_;
   std::map<std::string, std::vector<std::string>> values_;
+  bool help_ = false;
 };
+
+// True when `word` is an option word: "-" (standard input) and negative
+// numbers are arguments.
+bool IsOptionWord(const std::string& word);
+// -h or --help.
+bool IsHelpWord(const std::string& word);
+// The words with `separator` between them.
+std::string Join(const std::vector<std::string>& words, const char* separator = " ");
 
 // Decimal digits only, no sign or blanks, within the type's range.
 int32_t ParseInt32(const std::string& text, const std::string& what);
@@ -48,5 +100,14 @@ int64_t ParseInt64(const std::string& text, const std::string& what);
 
 // "A,B,C" to its names; an empty name is refused.
 std::vector<std::string> SplitNames(const std::string& text, const std::string& what);
+
+// The candidates nearest to a mistyped `word` (by edit distance, or those
+// it is a prefix of), for "did you mean ..."; empty when none is close.
+std::vector<std::string> Nearest(const std::string& word,
+                                 const std::vector<std::string>& candidates);
+// "; did you mean A or B?" for the nearest candidates, each after `before`,
+// or "".
+std::string DidYouMean(const std::string& word, const std::vector<std::string>& candidates,
+                       const std::string& before = "");
 
 }  // namespace TarnHost

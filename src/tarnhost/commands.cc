@@ -3,10 +3,6 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <fstream>
-#include <iostream>
-#include <iterator>
-#include <sstream>
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
@@ -18,8 +14,32 @@ namespace {
 
 using TarnCtl::Admin::Host;
 
-// Writes `text` to standard output; a failed write is the host tool's own
-// failure (exit status 1), reported like a refusal.
+// The whole file, or standard input for "-"; any failure names the file.
+std::string ReadFile(const std::string& path) {
+  const bool standardInput = path == "-";
+  std::FILE* file = standardInput ? stdin : std::fopen(path.c_str(), "rb");
+  auto fail = [&] {
+    const int error = errno;
+    if (file && !standardInput) std::fclose(file);
+    return HostCtl::Lib::HostCtlException(
+        "cannot read " + (standardInput ? std::string("standard input") : path) + ": " +
+            std::strerror(error),
+        "");
+  };
+  if (!file) throw fail();
+  std::string text;
+  char buffer[65536];
+  size_t n;
+  while ((n = std::fread(buffer, 1, sizeof buffer, file)) > 0) text.append(buffer, n);
+  if (std::ferror(file)) throw fail();
+  if (!standardInput) std::fclose(file);
+  return text;
+}
+
+}  // namespace
+
+// A failed write is the host tool's own failure (exit status 1), reported
+// like a refusal.
 int Print(const std::string& text) {
   std::fwrite(text.data(), 1, text.size(), stdout);
   if (std::fflush(stdout) != 0 || std::ferror(stdout)) {
@@ -29,78 +49,52 @@ int Print(const std::string& text) {
   return 0;
 }
 
-std::string ReadFile(const std::string& path) {
-  auto fail = [&](const char* why) {
-    return HostCtl::Lib::HostCtlException("cannot read " + path + ": " + why, "");
-  };
-  if (path == "-") {
-    std::ostringstream text;
-    text << std::cin.rdbuf();
-    if (std::cin.bad()) throw fail(std::strerror(errno));
-    return text.str();
-  }
-  std::ifstream in(path, std::ios::binary);
-  if (!in) throw fail(std::strerror(errno));
-  std::string text((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
-  if (in.bad()) throw fail(std::strerror(errno));
-  return text;
-}
-
-}  // namespace
-
-int Init(const Words& words) {
-  Args args(words, {{"empty", false}}, 0, 0);
+int Init(const Args& args) {
   Host().Init(args.Has("empty"));
   return 0;
 }
 
-int Show(const Words& words) {
-  Args(words, {}, 0, 0);
+int Show(const Args&) {
   return Print(Host().Show());
 }
 
-int Dump(const Words& words) {
-  Args(words, {}, 0, 0);
+int Dump(const Args&) {
   return Print(Host().Dump());
 }
 
-int Load(const Words& words) {
-  Args args(words, {}, 1, 1);
+int Load(const Args& args) {
   const std::string text = ReadFile(args.Positional(0));
   Host().Load(text);
   return 0;
 }
 
-int Reboot(const Words& words) {
-  Args(words, {}, 0, 0);
+int Reboot(const Args&) {
   Host().Reboot();
   return 0;
 }
 
-int AddPnic(const Words& words) {
-  Args args(words, {}, 1, 1);
+int Path(const Args&) {
+  return Print(TarnCtl::Admin::HostPath() + "\n");
+}
+
+int AddPnic(const Args& args) {
   Host().AddPnic(args.Positional(0));
   return 0;
 }
 
-int AddClient(const Words& words) {
-  Args args(words, {}, 2, 2);
+int AddClient(const Args& args) {
   Host().AddClient(args.Positional(0), args.Positional(1));
   return 0;
 }
 
-int AddSystemSwitch(const Words& words) {
-  Args args(words, {{"ports", true}}, 1, 1);
+int AddSystemSwitch(const Args& args) {
   int32_t ports = HostCtl::Network::Portset::DEF_NUM_PORTS;
   if (auto v = args.Value("ports")) ports = ParseInt32(*v, "--ports");
   Host().AddSystemSwitch(args.Positional(0), ports);
   return 0;
 }
 
-int AddDVSwitch(const Words& words) {
-  Args args(words,
-            {{"portset", true}, {"id", true}, {"ports", true}, {"mtu", true}, {"uplinks", true}}, 1,
-            1);
+int AddDVSwitch(const Args& args) {
   TarnCtl::Admin::DVSwitchSeed seed;
   seed.name = args.Positional(0);
   seed.portset = args.Value("portset");
@@ -112,8 +106,7 @@ int AddDVSwitch(const Words& words) {
   return 0;
 }
 
-int AddDVPort(const Words& words) {
-  Args args(words, {{"client", true, true}, {"connection-id", true}}, 2, 2);
+int AddDVPort(const Args& args) {
   TarnCtl::Admin::DVPortSeed seed;
   seed.dvs = args.Positional(0);
   seed.portId = args.Positional(1);
@@ -123,8 +116,7 @@ int AddDVPort(const Words& words) {
   return 0;
 }
 
-int AddOpaque(const Words& words) {
-  Args args(words, {{"portset", true}, {"ports", true}, {"used", true}, {"uplinks", true}}, 1, 1);
+int AddOpaque(const Args& args) {
   TarnCtl::Admin::OpaqueSeed seed;
   seed.name = args.Positional(0);
   seed.portset = args.Value("portset");
@@ -135,26 +127,21 @@ int AddOpaque(const Words& words) {
   return 0;
 }
 
-int AddUplinkTimeout(const Words& words) {
-  Args args(words, {}, 4, 4);
+int AddUplinkTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(2), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(3), "TIMEOUT");
   Host().AddUplinkTimeout(args.Positional(0), args.Positional(1), lagId, timeout);
   return 0;
 }
 
-int AddLagTimeout(const Words& words) {
-  Args args(words, {}, 3, 3);
+int AddLagTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(1), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(2), "TIMEOUT");
   Host().AddLagTimeout(args.Positional(0), lagId, timeout);
   return 0;
 }
 
-int AddFault(const Words& words) {
-  Args args(words,
-            {{"on", true}, {"message", true}, {"detail", true}, {"skip", true}, {"times", true}}, 1,
-            1);
+int AddFault(const Args& args) {
   TarnCtl::Admin::FaultSeed seed;
   seed.operation = args.Positional(0);
   seed.on = args.Value("on");
@@ -166,8 +153,7 @@ int AddFault(const Words& words) {
   return 0;
 }
 
-int ClearFaults(const Words& words) {
-  Args(words, {}, 0, 0);
+int ClearFaults(const Args&) {
   Host().ClearFaults();
   return 0;
 }

@@ -1,30 +1,31 @@
-// The bodies of tarnhost's commands: each takes the words after the
-// command's own words, runs one administration call, and returns the exit
-// status. Bad usage throws UsageError; the host's refusals throw
+// The bodies of tarnhost's commands: each runs one administration call on
+// its parsed arguments (see table.cc) and returns the exit status. Bad
+// usage throws UsageError; the host's refusals throw
 // HostCtl::Lib::HostCtlException.
 #pragma once
 
-#include <string>
-#include <vector>
+#include "tarnhost/args.h"
 
 namespace TarnHost {
 
-using Words = std::vector<std::string>;
+int Init(const Args& args);
+int Show(const Args& args);
+int Dump(const Args& args);
+int Load(const Args& args);
+int Reboot(const Args& args);
+int Path(const Args& args);
+int AddPnic(const Args& args);
+int AddClient(const Args& args);
+int AddSystemSwitch(const Args& args);
+int AddDVSwitch(const Args& args);
+int AddDVPort(const Args& args);
+int AddOpaque(const Args& args);
+int AddUplinkTimeout(const Args& args);
+int AddLagTimeout(const Args& args);
+int AddFault(const Args& args);
+int ClearFaults(const Args& args);
 
-int Init(const Words& words);
-int Show(const Words& words);
-int Dump(const Words& words);
-int Load(const Words& words);
-int Reboot(const Words& words);
-int AddPnic(const Words& words);
-int AddClient(const Words& words);
-int AddSystemSwitch(const Words& words);
-int AddDVSwitch(const Words& words);
-int AddDVPort(const Words& words);
-int AddOpaque(const Words& words);
-int AddUplinkTimeout(const Words& words);
-int AddLagTimeout(const Words& words);
-int AddFault(const Words& words);
-int ClearFaults(const Words& words);
+// Writes `text` to standard output and returns 0; a failed write throws.
+int Print(const std::string& text);
 
 }  // namespace TarnHost

@@ -1,8 +1,9 @@
-// tarnhost: administration of the simulated host (see docs/host.md).
+// tarnhost: administration of the simulated host (see docs/host.md). Its
+// commands are the rows of the command table (table.cc).
 //
 // Exit status: 0 success; 1 when the host refused (its message follows
 // "tarnhost: " on standard error); 2 for bad usage (the reason and the
-// usage text on standard error).
+// command's usage lines on standard error; nothing is opened).
 #include <cstdio>
 #include <exception>
 #include <string>
@@ -11,80 +12,48 @@
 #include "hostctl/exception.h"
 #include "tarnhost/args.h"
 #include "tarnhost/commands.h"
-#include "tarnhost/usage.h"
+#include "tarnhost/help.h"
+#include "tarnhost/table.h"
 
 namespace {
 
 using namespace TarnHost;
 
-struct Command {
-  std::vector<std::string> words;
-  int (*run)(const Words& args);
-};
-
-const std::vector<Command>& Commands() {
-  static const std::vector<Command> commands = {
-      {{"init"}, Init},
-      {{"show"}, Show},
-      {{"dump"}, Dump},
-      {{"load"}, Load},
-      {{"reboot"}, Reboot},
-      {{"pnic", "add"}, AddPnic},
-      {{"client", "add"}, AddClient},
-      {{"system-switch", "add"}, AddSystemSwitch},
-      {{"dvs", "add"}, AddDVSwitch},
-      {{"dvport", "add"}, AddDVPort},
-      {{"opaque", "add"}, AddOpaque},
-      {{"timeout", "uplink"}, AddUplinkTimeout},
-      {{"timeout", "lag"}, AddLagTimeout},
-      {{"fault", "add"}, AddFault},
-      {{"fault", "clear"}, ClearFaults},
-  };
-  return commands;
-}
-
-const Command* Find(const std::vector<std::string>& argv) {
-  for (const auto& c : Commands()) {
-    if (argv.size() < c.words.size()) continue;
-    bool match = true;
-    for (size_t i = 0; i < c.words.size(); ++i) match = match && argv[i] == c.words[i];
-    if (match) return &c;
-  }
-  return nullptr;
-}
-
-int UsageFailure(const std::string& why) {
+int UsageFailure(const std::string& why, const std::vector<const Command*>& commands) {
   std::fprintf(stderr, "tarnhost: %s\n", why.c_str());
-  PrintUsage(stderr);
+  if (commands.empty()) std::fputs("see 'tarnhost help'\n", stderr);
+  PrintUsageLines(commands, stderr);
   return 2;
 }
 
 }  // namespace
 
 int main(int argc, char** argv) {
-  const std::vector<std::string> words(argv + 1, argv + argc);
-  if (words.size() == 1 && (words[0] == "-h" || words[0] == "--help")) {
-    PrintUsage(stdout);
-    return std::fflush(stdout) == 0 ? 0 : 1;
+  const Words words(argv + 1, argv + argc);
+  if (words.empty()) {
+    std::fputs("tarnhost: no command given\n", stderr);
+    PrintTopUsage(stderr);
+    return 2;
   }
-  if (words.empty()) return UsageFailure("no command given");
-  const Command* command = Find(words);
-  if (!command) {
-    // Name the second word too when the first one starts a command.
-    std::string given = words[0];
-    for (const auto& c : Commands()) {
-      if (c.words.size() > 1 && c.words[0] == words[0]) {
-        if (words.size() == 1) return UsageFailure("missing subcommand after " + given);
-        given += " " + words[1];
-        break;
-      }
-    }
-    return UsageFailure("unknown command: " + given);
-  }
+  const Command* command = nullptr;
   try {
-    return command->run(Words(words.begin() + command->words.size(), words.end()));
+    size_t used = 0;
+    command = Find(words, &used);
+    if (!command) {
+      // -h or --help right after the first words of some commands: theirs.
+      const size_t known = KnownPrefix(words);
+      if (known == 0 || known == words.size() || !IsHelpWord(words[known])) Explain(words);
+      PrintHelp(Select(Words(words.begin(), words.begin() + known)), stdout);
+      return Print("");
+    }
+    const Args args(Words(words.begin() + used, words.end()), command->syntax, command->Name());
+    if (!args.HelpRequested()) return command->run(args);
+    PrintHelp({command}, stdout);
+    return Print("");  // checks that it was written
+  } catch (const CommandError& e) {
+    return UsageFailure(e.what(), e.commands);
   } catch (const UsageError& e) {
-    return UsageFailure(e.what());
+    return UsageFailure(e.what(), {command});
   } catch (const HostCtl::Lib::HostCtlException& e) {
     std::fprintf(stderr, "tarnhost: %s\n", e.GetMessage().c_str());
     return 1;

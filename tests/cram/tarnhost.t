@@ -1,77 +1,148 @@
 tarnhost: the administration tool of the simulated host.
 
   $ . "$TESTDIR/setup.sh"
-  $ usage() { "$@" 2>err; echo "status $?"; head -1 err; tail -n +2 err | cmp - help; }
   $ refused() { "$@" 2>err; echo "status $?"; cat err; }
+  $ brief() { # status, output lines joined by |, usage lines cut after the command's words
+  >   out=$(tarnhost "$@" 2>&1 < /dev/null)
+  >   echo "$? $out" | sed -E 's/(tarnhost [a-z -]*[a-z]) [A-Z[].*/\1 .../' | grep . | paste -sd'|'; }
 
-Help goes to standard output with status 0; it is the text bad usage shows.
+The usage, made from the command table, is what help, -h and --help print on
+standard output with status 0; without a command it is bad usage.
 
-  $ tarnhost --help > help
-  $ tarnhost -h | cmp - help
+  $ tarnhost help > help
+  $ tarnhost -h | cmp - help && tarnhost --help | cmp - help
+  $ tarnhost 2>&1 >/dev/null | tail -n +2 | cmp - help; tarnhost 2>&1 | head -1
+  tarnhost: no command given
   $ cat help
   usage: tarnhost COMMAND [ARGUMENTS]
-  Administers the simulated host kept in $TARN_HOST_DB (see docs/host.md).
+  Administers the simulated host: the host file named by TARN_HOST_DB, or the
+  default location; see 'tarnhost path'.
   
-    init [--empty]        reset: the default host, or a host with nothing at all
-    show                  the host in readable form: running state and stored configuration
-    dump                  the whole host as JSON on standard output
-    load FILE             replace the host with a dump (FILE - : standard input)
-    reboot                drop the running state, keep the stored configuration
-    pnic add NAME
-    client add PORTGROUP CLIENT
+    init [--empty]                reset the host to the default host, or to an empty one
+    show                          print the host in readable form
+    dump                          write the whole host as JSON on standard output
+    load FILE                     replace the host with a dump (FILE - : standard input)
+    reboot                        drop the running state, keep the stored configuration
+    path                          print the path of the host file
+    pnic add NAME                 add a physical NIC
+    client add PORTGROUP CLIENT   connect a client to a port group
     system-switch add NAME [--ports N]
+                                  add a system switch
     dvs add NAME [--portset NAME] [--id ID] [--ports N] [--mtu N] [--uplinks A,B,...]
+                                  add a distributed switch
     dvport add DVS PORTID [--client NAME]... [--connection-id N]
+                                  add a DVPort to a distributed switch
     opaque add NAME [--portset NAME] [--ports N] [--used N] [--uplinks A,B,...]
-    timeout uplink PORTSET UPLINK LAGID TIMEOUT
-    timeout lag PORTSET LAGID TIMEOUT
+                                  add an opaque switch
+    timeout add uplink PORTSET UPLINK LAGID TIMEOUT
+                                  store an uplink timeout record
+    timeout add lag PORTSET LAGID TIMEOUT
+                                  store a LAG timeout record
     fault add OPERATION [--on NAME] [--message TEXT] [--detail TEXT] [--skip K] [--times N]
-    fault clear
-    -h, --help            this text
+                                  make a library operation fail
+    fault clear                   remove every armed fault
+    help [COMMAND...]             print this text, or the help of COMMAND
+    --version                     print tarnhost's version
   
-  Numbers are decimal. Options take their value as --opt VALUE or --opt=VALUE;
-  "--" ends the options. Exit status: 0 success, 1 refused by the host, 2 bad usage.
+  'tarnhost help COMMAND' or 'tarnhost COMMAND --help' prints the help of a
+  command. Numbers are decimal. Options take their value as --opt VALUE or
+  --opt=VALUE; "--" ends the options. Exit status: 0 success, 1 refused by the
+  host, 2 bad usage.
 
-Bad usage: the reason and the usage text on standard error, no host opened.
+Help at every level: that of the commands that begin with the words given,
+also with -h or --help after them (which wins over mistakes, but not over
+"--" or an option's value).
 
-  $ usage tarnhost
-  status 2
-  tarnhost: no command given
-  $ while read -r args; do eval "set -- $args"; usage tarnhost "$@" < /dev/null; done <<'EOF' | paste -d' ' - -
+  $ tarnhost help fault
+  usage: tarnhost fault add OPERATION [--on NAME] [--message TEXT] [--detail TEXT] [--skip K] [--times N]
+         tarnhost fault clear
+  
+  fault add: make a library operation fail
+    OPERATION is named as in the host control interface (SetVlanId, AddUplink,
+    ...); its next matching calls throw. NODI_CheckSig fails by returning a
+    non-zero status and GetIntParamList by returning no list. Faults are used up
+    across runs; 'tarnhost show' lists those still armed.
+    --on NAME       only calls on the object of that name, or given that name
+    --message TEXT  the exception's message (default: injected fault)
+    --detail TEXT   its detailed message (default: injected fault in OPERATION)
+    --skip K        let K matching calls pass first (default 0)
+    --times N       fail N calls (default 1)
+  
+  fault clear: remove every armed fault
+  $ tarnhost fault --help | cmp - <(tarnhost help fault) && tarnhost -h timeout uplink | tail -1
+    Also spelled: timeout uplink.
+  $ for args in 'pnic -h' 'show -h' 'dvs add --help' 'init --full -h' 'timeout add -h' \
+  >     'timeout lag 1 -h' 'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
+  >   brief $args | cut -d'|' -f1-2; done
+  0 usage: tarnhost pnic add ...|pnic add: add a physical NIC
+  0 usage: tarnhost show|show: print the host in readable form
+  0 usage: tarnhost dvs add ...|dvs add: add a distributed switch
+  0 usage: tarnhost init ...|init: reset the host to the default host, or to an empty one
+  0 usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
+  0 usage: tarnhost timeout add lag ...|timeout add lag: store a LAG timeout record
+  0 usage: tarnhost help ...|help: print this text, or the help of COMMAND
+  2 tarnhost: unexpected argument x|usage: tarnhost fault add ...
+  2 tarnhost: bad number for --mtu: "-h"|usage: tarnhost dvs add ...
+  $ tarnhost --version
+  tarnhost \d+\.\d+\.\d+ (re)
+  $ tarnhost path | sed "s|$PWD|PWD|"
+  PWD/host.db
+
+Bad usage: the reason, naming what is missing or unknown, and the usage lines
+of the command, or a hint where none is known, on standard error; status 2.
+
+  $ while read -r args; do eval "set -- $args"; brief "$@"; done <<'EOF'
   > bogus
+  > dumo
+  > --verison
   > pnic
+  > timeout add
   > pnic remove pnic9
+  > fault ad X
   > pnic add
+  > client add Management
   > pnic add a b
   > init --empty=yes
   > init --full
   > timeout lag vs0 1 -5
-  > timeout lag vs0 0x10 5
-  > timeout lag vs0 4294967296 5
+  > timeout add lag vs0 0x10 5
+  > timeout add lag vs0 4294967296 5
   > system-switch add s1 --ports 2147483648
   > system-switch add s1 --ports 64 --ports 64
   > dvs add d1 --uplinks pnic1,,pnic2
   > dvs add d1 --mtu
   > fault add GetName --skip ' 1'
+  > help pnic remove
   > EOF
-  status 2 tarnhost: unknown command: bogus
-  status 2 tarnhost: missing subcommand after pnic
-  status 2 tarnhost: unknown command: pnic remove
-  status 2 tarnhost: missing arguments
-  status 2 tarnhost: too many arguments
-  status 2 tarnhost: option --empty takes no value
-  status 2 tarnhost: unknown option --full
-  status 2 tarnhost: bad number for TIMEOUT: "-5"
-  status 2 tarnhost: bad number for LAGID: "0x10"
-  status 2 tarnhost: number for LAGID out of range: 4294967296
-  status 2 tarnhost: number for --ports out of range: 2147483648
-  status 2 tarnhost: option --ports given twice
-  status 2 tarnhost: empty name in --uplinks
-  status 2 tarnhost: option --mtu needs a value
-  status 2 tarnhost: bad number for --skip: " 1"
+  2 tarnhost: unknown command: bogus|see 'tarnhost help'
+  2 tarnhost: unknown command: dumo; did you mean dump?|see 'tarnhost help'
+  2 tarnhost: unknown option --verison; did you mean --version?|see 'tarnhost help'
+  2 tarnhost: missing verb after pnic (add)|usage: tarnhost pnic add ...
+  2 tarnhost: missing word after timeout add (uplink, lag)|usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
+  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...
+  2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault clear
+  2 tarnhost: missing NAME|usage: tarnhost pnic add ...
+  2 tarnhost: missing CLIENT|usage: tarnhost client add ...
+  2 tarnhost: unexpected argument b|usage: tarnhost pnic add ...
+  2 tarnhost: option --empty takes no value|usage: tarnhost init ...
+  2 tarnhost: unknown option --full for init|usage: tarnhost init ...
+  2 tarnhost: bad number for TIMEOUT: "-5"|usage: tarnhost timeout add lag ...
+  2 tarnhost: bad number for LAGID: "0x10"|usage: tarnhost timeout add lag ...
+  2 tarnhost: number for LAGID out of range: 4294967296|usage: tarnhost timeout add lag ...
+  2 tarnhost: number for --ports out of range: 2147483648|usage: tarnhost system-switch add ...
+  2 tarnhost: option --ports given twice|usage: tarnhost system-switch add ...
+  2 tarnhost: empty name in --uplinks|usage: tarnhost dvs add ...
+  2 tarnhost: option --mtu needs a value|usage: tarnhost dvs add ...
+  2 tarnhost: bad number for --skip: " 1"|usage: tarnhost fault add ...
+  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...
   $ ls
-  err
   help
+
+The completion (asking tarnhost) offers exactly, and the man page lists
+exactly, the commands and options of the table as the usage shows it.
+
+  $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
+  18 commands, 18 options compared
 
 The default host as a dump.
 
@@ -121,7 +192,7 @@ Seeding shows up, and a dump brings it all back.
   $ tarnhost dvport add dvs0 10 --client vmA --client vmB --connection-id 7
   $ tarnhost opaque add opq0 --used 3 --uplinks pnic3
   $ tarnhost timeout uplink vswitch0 pnic0 1 5
-  $ tarnhost timeout lag ps0 2 255
+  $ tarnhost timeout add lag ps0 2 255
   $ tarnhost fault add SetVlanId --on pg2 --skip 1 --message boom
   $ tarnhost fault add -- -odd
   tarnhost: Unknown operation -odd
@@ -181,9 +252,13 @@ A faulty dump or file is refused and the host stays as it was.
   $ refused tarnhost load cut.json
   status 1
   tarnhost: Cannot load dump: not valid JSON: parse error at line 21, column 8: syntax error while parsing object key - unexpected end of input; expected string literal
-  $ refused tarnhost load nosuch.json
+  $ for f in nosuch.json .; do refused tarnhost load $f; done; refused tarnhost load - < .
   status 1
   tarnhost: cannot read nosuch.json: No such file or directory
+  status 1
+  tarnhost: cannot read .: Is a directory
+  status 1
+  tarnhost: cannot read standard input: Is a directory
   $ tarnhost dump | cmp - seeded.json
 
 States that only the library makes (ENS, events, loaded timeouts, DVPort
@@ -194,7 +269,7 @@ replaced) survive a dump too.
   $ tarnhost client add Management vm1
   $ tarnhost dvs add dA --portset P --uplinks pnic1
   $ tarnhost dvport add dA 1 --client c1 --connection-id 3
-  $ tarnhost timeout uplink vswitch0 pnic0 1 5
+  $ tarnhost timeout add uplink vswitch0 pnic0 1 5
   $ orvocfg-vswitch -a vs1 && orvocfg-vswitch -L pnic2 vs1 && orvocfg-vswitch -A pg1 vs1 &&
   > orvocfg-vswitch -v 10 -p pg1 vs1 && orvocfg-vswitch --ens-ready && orvocfg-vswitch -y -i vs1 &&
   > orvocfg-vswitch -z vs1 && orvocfg-vswitch -O && orvocfg-vswitch -P pnic3 -V 1 dA

@@ -71,12 +71,12 @@ for c in "${commands[@]}"; do
     cmp -s <(zcat "$page") "$source_dir/docs/man/$c.8" || fail "$c.8.gz is not docs/man/$c.8"
 done
 
-# Completion of the installed files, in a shell of its own. Prints the
-# replies one a line.
+# Completion of the installed files, in a shell of its own (tarnhost's asks
+# the installed tarnhost). Prints the replies one a line.
 complete_words() { # command file words...
     local file=$1
     shift
-    bash --norc --noprofile -c '
+    PATH=$root/sbin:$PATH bash --norc --noprofile -c '
         source "$1" || exit 1
         shift
         COMP_WORDS=("$@")
@@ -117,10 +117,11 @@ cases=(
     "orvocfg-vswitch --set-cdp=a|--set-cdp=advertise|advertise"
     "orvocfg-vswitch -L pn||--add"
     "tarnhost d|dump dvs dvport|init"
-    "tarnhost dvs add dvs0 --p|--portset --ports|--used"
+    "tarnhost dvs add dvs0 --ports = 8 --p|--portset|--ports --used"
+    "tarnhost load /et|/etc|"
     "tarnhost fault ''|add clear|"
     "tarnhost fault add SetV|SetVlanId|--on"
-    "tarnhost timeout ''|uplink lag|add"
+    "tarnhost timeout ''|add|uplink lag"
 )
 for case in "${cases[@]}"; do
     IFS='|' read -r line want refuse <<<"$case"

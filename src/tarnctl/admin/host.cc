@@ -19,6 +19,19 @@ using Instrument::Refused;
 using Instrument::Scope;
 using Store::Transaction;
 
+std::string HostPath() {
+  return Api::Session::DefaultLocation().path;
+}
+
+std::vector<OperationInfo> LibraryOperations() {
+  std::vector<OperationInfo> operations;
+  for (const auto& operation : Instrument::Operations()) {
+    operations.push_back(
+        {operation.name, Instrument::TargetText(operation.targets), operation.faultable});
+  }
+  return operations;
+}
+
 Host::Host() : state_(std::make_unique<State>(State{Api::Session::Acquire()})) {}
 
 Host::~Host() = default;

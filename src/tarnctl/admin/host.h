@@ -48,6 +48,19 @@ struct FaultSeed {
   int64_t times = 1;
 };
 
+// The host file that Host() opens, as the environment names it; refuses a
+// mistaken name (TARN_HOST_DB starting with "~").
+std::string HostPath();
+
+// An operation of the host control library, for arming faults.
+struct OperationInfo {
+  std::string name;
+  std::string target;  // what --on may name for it, in words
+  bool faultable;      // false: it runs without the host and cannot fail
+};
+// Every operation of the library, in name order.
+std::vector<OperationInfo> LibraryOperations();
+
 // Reports progress of a long operation: rows done so far of `total`.
 using Progress = std::function<void(int64_t done, int64_t total)>;
 

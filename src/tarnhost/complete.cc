@@ -1,0 +1,109 @@
+#include "tarnhost/complete.h"
+
+#include <algorithm>
+
+#include "tarnctl/admin/host.h"
+#include "tarnhost/commands.h"
+#include "tarnhost/table.h"
+
+namespace TarnHost {
+
+const std::vector<std::string>& FaultOperationNames() {
+  static const std::vector<std::string> names = [] {
+    std::vector<std::string> faultable;
+    for (const auto& operation : TarnCtl::Admin::LibraryOperations()) {
+      if (operation.faultable) faultable.push_back(operation.name);
+    }
+    return faultable;
+  }();
+  return names;
+}
+
+namespace {
+
+// The words of `kind` that can stand where `given` (the arguments before)
+// leads; the host's own objects are not offered (yet): they would be
+// looked up here.
+Words Candidates(Kind kind, const Words& given) {
+  switch (kind) {
+    case Kind::Command:
+      return NextWords(given);
+    case Kind::Operation:
+      return FaultOperationNames();
+    default:
+      return {};
+  }
+}
+
+int Offer(const char* what, const Words& candidates, const std::string& current,
+          const std::string& before = "") {
+  std::string text = std::string(what) + "\n";
+  for (const auto& c : candidates) {
+    // Options only where one is being typed, and only then.
+    if (c.compare(0, current.size(), current) == 0 && (c[0] == '-') == (current[0] == '-')) {
+      text += before + c + "\n";
+    }
+  }
+  return Print(text);
+}
+
+}  // namespace
+
+int Complete(const Args& args) {
+  if (args.Positionals().empty()) return Offer("words", {}, "");
+  const Words& all = args.Positionals();
+  const std::string& current = all.back();
+  const Words before(all.begin(), all.end() - 1);
+  size_t used = 0;
+  const Command* command = Find(before, &used);
+  if (!command) {
+    return Offer("words", KnownPrefix(before) == before.size() ? NextWords(before) : Words{},
+                 current);
+  }
+  // Where the current word stands: after an option that wants its value,
+  // after "--", or at which argument.
+  const Syntax& syntax = command->syntax;
+  const OptionSpec* pending = nullptr;
+  bool optionsEnded = syntax.raw;
+  Words given, options;
+  for (size_t i = used; i < before.size(); ++i) {
+    const std::string& word = before[i];
+    if (pending) {
+      pending = nullptr;
+    } else if (optionsEnded || !IsOptionWord(word)) {
+      given.push_back(word);
+    } else if (word == "--") {
+      optionsEnded = true;
+    } else if (word[1] == '-') {
+      const std::string name = word.substr(0, word.find('='));
+      const OptionSpec* o = syntax.Option(name.substr(2));
+      if (o && o->TakesValue() && name == word) pending = o;
+      options.push_back(name);
+    }
+  }
+  if (pending) return Offer("words", Candidates(pending->kind, {}), current);
+  if (!optionsEnded && current.compare(0, 2, "--") == 0 && current.find('=') != std::string::npos) {
+    const std::string name = current.substr(0, current.find('='));
+    const OptionSpec* o = syntax.Option(name.substr(2));
+    if (!o || !o->TakesValue()) return Offer("words", {}, current);
+    return Offer("words", Candidates(o->kind, {}), current.substr(name.size() + 1), name + "=");
+  }
+  if (!optionsEnded && !current.empty() && current[0] == '-') {
+    Words names;
+    for (const auto& o : syntax.options) {
+      const std::string name = "--" + std::string(o.name);
+      if (o.repeatable || std::find(options.begin(), options.end(), name) == options.end()) {
+        names.push_back(name);
+      }
+    }
+    return Offer("words", names, current);
+  }
+  const auto& specs = syntax.arguments;
+  const ArgumentSpec* spec = given.size() < specs.size()              ? &specs[given.size()]
+                             : !specs.empty() && specs.back().repeats ? &specs.back()
+                                                                      : nullptr;
+  if (spec && spec->kind == Kind::File) return Offer("files", {}, current);
+  return Offer("words", spec ? Candidates(spec->kind, given) : Words{}, current);
+}
+
+}  // namespace TarnHost

@@ -1,0 +1,270 @@
+#include "tarnhost/table.h"
+
+#include <algorithm>
+
+#include "tarnhost/commands.h"
+#include "tarnhost/complete.h"
+#include "tarnhost/help.h"
+
+namespace TarnHost {
+namespace {
+
+// Options that several commands share.
+const OptionSpec kPorts{
+    .name = "ports", .value = "N", .help = "number of ports (default 128)", .kind = Kind::Number};
+const OptionSpec kPortset{
+    .name = "portset", .value = "NAME", .help = "portset name (default NAME)"};
+const OptionSpec kUplinks{.name = "uplinks",
+                          .value = "A,B,...",
+                          .help = "uplinks: pnics that no switch uses",
+                          .kind = Kind::PnicList};
+
+#define TIMEOUT_RULES                                                                       \
+  "The timeout is 0 to 255 and the portset 1 to 31 bytes; the portset need not exist yet, " \
+  "and a record with the same key must not be stored already."
+
+bool StartsWith(const Words& words, const Words& prefix) {
+  return words.size() >= prefix.size() && std::equal(prefix.begin(), prefix.end(), words.begin());
+}
+
+// Its words first, then its other spellings.
+std::vector<Words> Spellings(const Command& c) {
+  std::vector<Words> all{c.words};
+  all.insert(all.end(), c.also.begin(), c.also.end());
+  return all;
+}
+
+}  // namespace
+
+std::string Command::Name() const {
+  return Join(words);
+}
+
+const std::vector<Command>& Commands() {
+  static const std::vector<Command> commands = {
+      {.words = {"init"},
+       .syntax = {.options = {{.name = "empty", .help = "a host with nothing at all"}}},
+       .summary = "reset the host to the default host, or to an empty one",
+       .help = "The default host has the pnics pnic0 to pnic3 and the standard switch vswitch0, "
+               "linked to pnic0, with its port group Management.",
+       .run = Init},
+      {.words = {"show"},
+       .summary = "print the host in readable form",
+       .help = "Prints the pnics, the running state, the stored configuration, the distributed "
+               "switch cache, opaque switches, DVPorts, events and armed faults.",
+       .run = Show},
+      {.words = {"dump"},
+       .summary = "write the whole host as JSON on standard output",
+       .help = "A dump of a loaded dump is the same text.",
+       .run = Dump},
+      {.words = {"load"},
+       .syntax = {.arguments = {{"FILE", Kind::File}}},
+       .summary = "replace the host with a dump (FILE - : standard input)",
+       .help = "The document is checked first: a malformed or inconsistent dump is refused as a "
+               "whole and the host stays as it was.",
+       .run = Load},
+      {.words = {"reboot"},
+       .summary = "drop the running state, keep the stored configuration",
+       .help = "As a restart of the host would.",
+       .run = Reboot},
+      {.words = {"path"},
+       .summary = "print the path of the host file",
+       .help = "The file named by TARN_HOST_DB, or when that is unset or empty, the default "
+               "location for this user. A missing file is created holding the default host by "
+               "the first command that opens the host.",
+       .run = Path},
+      {.words = {"pnic", "add"},
+       .syntax = {.arguments = {{"NAME"}}},
+       .summary = "add a physical NIC",
+       .help = "Its name is 1 to 31 bytes and unique.",
+       .run = AddPnic},
+      {.words = {"client", "add"},
+       .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup}, {"CLIENT"}}},
+       .summary = "connect a client to a port group",
+       .help = "The port group is one of the running state; the client takes one port of its "
+               "switch. Client names are 1 to 127 bytes, unique on their port group.",
+       .run = AddClient},
+      {.words = {"system-switch", "add"},
+       .syntax = {.arguments = {{"NAME"}}, .options = {kPorts}},
+       .summary = "add a system switch",
+       .help = "It has MTU 1500, CDP listen and an empty uplink order, in both layers; "
+               "orvocfg-vswitch lists it with -l -S only.",
+       .run = AddSystemSwitch},
+      {.words = {"dvs", "add"},
+       .syntax = {.arguments = {{"NAME"}},
+                  .options = {kPortset,
+                              {.name = "id", .value = "ID", .help = "switch id (default dvs-NAME)"},
+                              kPorts,
+                              {.name = "mtu",
+                               .value = "N",
+                               .help = "MTU, 1280 to 9000 (default 1500)",
+                               .kind = Kind::Number},
+                              kUplinks}},
+       .summary = "add a distributed switch",
+       .help = "Adds it to the running state and the distributed switch cache. Its names and "
+               "switch id must not be used by any switch.",
+       .run = AddDVSwitch},
+      {.words = {"dvport", "add"},
+       .syntax = {.arguments = {{"DVS", Kind::DVSwitch}, {"PORTID"}},
+                  .options = {{.name = "client",
+                               .value = "NAME",
+                               .repeatable = true,
+                               .help = "a client of the port, once for each"},
+                              {.name = "connection-id",
+                               .value = "N",
+                               .help = "connection id (default 0)",
+                               .kind = Kind::Number}}},
+       .summary = "add a DVPort to a distributed switch",
+       .help = "A switch holds at most its number of ports of DVPorts.",
+       .run = AddDVPort},
+      {.words = {"opaque", "add"},
+       .syntax = {.arguments = {{"NAME"}},
+                  .options = {kPortset,
+                              kPorts,
+                              {.name = "used",
+                               .value = "N",
+                               .help = "ports in use, at most --ports (default 0)",
+                               .kind = Kind::Number},
+                              kUplinks}},
+       .summary = "add an opaque switch",
+       .help = "orvocfg-vswitch lists it but cannot change it.",
+       .run = AddOpaque},
+      {.words = {"timeout", "add", "uplink"},
+       .also = {{"timeout", "uplink"}},
+       .syntax = {.arguments = {{"PORTSET", Kind::Portset},
+                                {"UPLINK", Kind::Pnic},
+                                {"LAGID", Kind::Number},
+                                {"TIMEOUT", Kind::Number}}},
+       .summary = "store an uplink timeout record",
+       .help = "orvocfg-vswitch -O loads the matching records. " TIMEOUT_RULES,
+       .run = AddUplinkTimeout},
+      {.words = {"timeout", "add", "lag"},
+       .also = {{"timeout", "lag"}},
+       .syntax = {.arguments = {{"PORTSET", Kind::Portset},
+                                {"LAGID", Kind::Number},
+                                {"TIMEOUT", Kind::Number}}},
+       .summary = "store a LAG timeout record",
+       .help = "orvocfg-vswitch -G loads the matching records. " TIMEOUT_RULES,
+       .run = AddLagTimeout},
+      {.words = {"fault", "add"},
+       .syntax = {.arguments = {{"OPERATION", Kind::Operation}},
+                  .options = {{.name = "on",
+                               .value = "NAME",
+                               .help = "only calls on the object of that name, or given that name",
+                               .kind = Kind::Object},
+                              {.name = "message",
+                               .value = "TEXT",
+                               .help = "the exception's message (default: injected fault)"},
+                              {.name = "detail",
+                               .value = "TEXT",
+                               .help = "its detailed message (default: injected fault in "
+                                       "OPERATION)"},
+                              {.name = "skip",
+                               .value = "K",
+                               .help = "let K matching calls pass first (default 0)",
+                               .kind = Kind::Number},
+                              {.name = "times",
+                               .value = "N",
+                               .help = "fail N calls (default 1)",
+                               .kind = Kind::Number}}},
+       .summary = "make a library operation fail",
+       .help = "OPERATION is named as in the host control interface (SetVlanId, AddUplink, ...); "
+               "its next matching calls throw. NODI_CheckSig fails by returning a non-zero "
+               "status and GetIntParamList by returning no list. Faults are used up across "
+               "runs; 'tarnhost show' lists those still armed.",
+       .run = AddFault},
+      {.words = {"fault", "clear"}, .summary = "remove every armed fault", .run = ClearFaults},
+      {.words = {"help"},
+       .also = {{"-h"}, {"--help"}},
+       .syntax = {.arguments = {{"COMMAND", Kind::Command, true, true}}},
+       .summary = "print this text, or the help of COMMAND",
+       .help = "-h or --help after a command's words prints the same help.",
+       .run = Help},
+      {.words = {"--version"}, .summary = "print tarnhost's version", .run = Version},
+      {.words = {"__complete"},
+       .syntax = {.arguments = {{"WORD", Kind::Text, true, true}}, .raw = true},
+       .summary = "complete the last WORD of a command line, for the shell",
+       .help = "Prints what the word is (files or words), then the words that fit, one a line.",
+       .run = Complete,
+       .hidden = true},
+  };
+  return commands;
+}
+
+const Command* Find(const Words& words, size_t* used) {
+  const Command* found = nullptr;
+  *used = 0;
+  for (const auto& c : Commands()) {
+    for (const auto& spelling : Spellings(c)) {
+      if (spelling.size() > *used && StartsWith(words, spelling)) {
+        found = &c;
+        *used = spelling.size();
+      }
+    }
+  }
+  return found;
+}
+
+std::vector<const Command*> Select(const Words& prefix) {
+  std::vector<const Command*> listed, hidden;
+  for (const auto& c : Commands()) {
+    const auto spellings = Spellings(c);
+    if (std::none_of(spellings.begin(), spellings.end(),
+                     [&](const Words& s) { return StartsWith(s, prefix); })) {
+      continue;
+    }
+    (c.hidden ? hidden : listed).push_back(&c);
+  }
+  return listed.empty() ? hidden : listed;
+}
+
+Words NextWords(const Words& prefix) {
+  Words next;
+  for (const auto& c : Commands()) {
+    if (c.hidden || c.words.size() <= prefix.size() || !StartsWith(c.words, prefix)) continue;
+    const std::string& word = c.words[prefix.size()];
+    if (std::find(next.begin(), next.end(), word) == next.end()) next.push_back(word);
+  }
+  return next;
+}
+
+size_t KnownPrefix(const Words& words) {
+  size_t known = 0;
+  while (known < words.size()) {
+    const Words next = NextWords(Words(words.begin(), words.begin() + known));
+    if (std::find(next.begin(), next.end(), words[known]) == next.end()) break;
+    ++known;
+  }
+  return known;
+}
+
+[[noreturn]] void Explain(const Words& words) {
+  const size_t known = KnownPrefix(words);
+  const Words prefix(words.begin(), words.begin() + known);
+  const Words next = NextWords(prefix);
+  const std::string before = known == 0 ? "" : Join(prefix) + " ";
+  if (known == words.size()) {
+    throw CommandError(std::string("missing ") + (known == 1 ? "verb" : "word") + " after " +
+                           before + "(" + Join(next, ", ") + ")",
+                       Select(prefix));
+  }
+  const std::string& word = words[known];
+  const bool option = known == 0 && IsOptionWord(word);
+  throw CommandError((option ? "unknown option " : "unknown command: ") + before + word +
+                         DidYouMean(word, next, before),
+                     known == 0 ? std::vector<const Command*>{} : Select(prefix));
+}
+
+const Command& Resolve(const Words& words, size_t* used) {
+  const Command* command = Find(words, used);
+  if (!command) Explain(words);
+  return *command;
+}
+
+std::vector<const Command*> SelectOrExplain(const Words& prefix) {
+  auto selected = Select(prefix);
+  if (selected.empty()) Explain(prefix);
+  return selected;
+}
+
+}  // namespace TarnHost
