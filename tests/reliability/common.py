@@ -22,6 +22,11 @@ class Host:
         return subprocess.run(args, env=self.env, capture_output=True, text=True,
                               errors="replace")
 
+    def run_as(self, db, *args):
+        """Runs with the host reached through the path `db`."""
+        return subprocess.run(args, env=dict(self.env, TARN_HOST_DB=db), capture_output=True,
+                              text=True, errors="replace")
+
     def must(self, *args):
         r = self.run(*args)
         if r.returncode != 0:

@@ -2,12 +2,15 @@
 """Many programs on one host at once.
 
 Eight processes add port groups to vswitch0 while four link and unlink a
-pnic each on vs1. No run may fail; every added port group and each pnic's
-last link state must be in both layers, and vs1's teaming order must hold
-its linked pnics once each, all active (no policy update lost).
+pnic each on vs1, each process reaching the host through one of three
+names: the file, a symbolic link to it and a hard link to it (one host, one
+lock). No run may fail; every added port group and each pnic's last link
+state must be in both layers, and vs1's teaming order must hold its linked
+pnics once each, all active (no policy update lost).
 
 usage: concurrency.py BIN_DIR
 """
+import os
 import sys
 import threading
 import time
@@ -22,27 +25,32 @@ LINK_WORKERS = 4
 def main():
     bin_dir = sys.argv[1]
     host = Host(bin_dir, "concurrency.")
-    tool, tarnhost, run, must = host.tool, host.tarnhost, host.run, host.must
+    tool, tarnhost, must = host.tool, host.tarnhost, host.must
     must(tarnhost, "init")
     must(tool, "-a", "vs1")
     pnics = [f"pnic{4 + w}" for w in range(LINK_WORKERS)]
     for pnic in pnics:
         must(tarnhost, "pnic", "add", pnic)
 
+    # Three names of one host file.
+    aliases = [host.db, os.path.join(host.work, "alias.db"), os.path.join(host.work, "hard.db")]
+    os.symlink(host.db, aliases[1])
+    os.link(host.db, aliases[2])
+
     runs = []  # (argv, returncode, stderr), appended by every worker
     lock = threading.Lock()
     adding = threading.Event()
     adding.set()
 
-    def record(args):
-        r = run(*args)
+    def record(args, name):
+        r = host.run_as(aliases[name % len(aliases)], *args)
         with lock:
             runs.append((args, r.returncode, r.stderr.strip()))
         return r.returncode
 
     def add_port_groups(w):
         for i in range(PGS_PER_WORKER):
-            record((tool, "-A", f"pg{w}_{i}", "vswitch0"))
+            record((tool, "-A", f"pg{w}_{i}", "vswitch0"), w + i)
 
     last_linked = {}  # pnic -> state after its last command that exited 0
 
@@ -52,7 +60,7 @@ def main():
         # Keep going while port groups are added; odd workers end linked.
         while adding.is_set() or linked != (w % 2 == 1):
             op = "-U" if linked else "-L"
-            if record((tool, op, pnic, "vs1")) != 0:
+            if record((tool, op, pnic, "vs1"), w) != 0:
                 return  # counted as a failure; retrying would only hide it
             linked = not linked
             last_linked[pnic] = linked

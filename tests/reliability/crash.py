@@ -1,10 +1,13 @@
 #!/usr/bin/env python3
 """Changes killed with SIGKILL at random moments.
 
-Each round runs a logged shell loop of changes (-A, -D, -a, pnic add) and
-kills it after a random delay. Then the host must open, pass sqlite3's
-integrity check, hold every acknowledged change, nothing never started, and
-an unacknowledged one whole or not at all (both layers alike).
+Each round runs a logged shell loop of changes (-A, -D, -a, pnic add, and
+-L/-U of pnics on one switch) and kills it after a random delay. Then the
+host must open, pass sqlite3's integrity check, hold every acknowledged
+change, nothing never started, and an unacknowledged one whole or not at
+all (both layers alike). A run is one change however many library calls it
+makes: a pnic is linked to the switch exactly when it is in its teaming
+order (-L and -U each link and store the order).
 
 usage: crash.py BIN_DIR [ROUNDS [SEED]]
 """
@@ -29,6 +32,10 @@ def main():
     host = Host(bin_dir, "crash.")
     tool, tarnhost, work, env = host.tool, host.tarnhost, host.work, host.env
     host.must(tarnhost, "init")
+    host.must(tool, "-a", "cs")
+    uplinks = [f"c{i}" for i in range(4)]
+    for pnic in uplinks:
+        host.must(tarnhost, "pnic", "add", pnic)
 
     # name -> the states it may be in: {True} present, {False} absent.
     expected = {"pg": {}, "switch": {}, "pnic": {}}
@@ -45,9 +52,12 @@ def main():
                 changes.append(("switch", f"s{r}_{k}", True, [tool, "-a", f"s{r}_{k}"]))
             elif k % 8 == 5:
                 changes.append(("pnic", f"n{r}_{k}", True, [tarnhost, "pnic", "add", f"n{r}_{k}"]))
-            elif k % 4 == 3:
-                changes.append(("pg", f"p{r}_{k - 1}", False,
-                                [tool, "-D", f"p{r}_{k - 1}", "vswitch0"]))
+            elif k % 8 in (1, 2):
+                pnic = uplinks[k // 8 % len(uplinks)]
+                changes.append(("link", pnic, None, [tool, "-L" if k % 8 == 1 else "-U", pnic, "cs"]))
+            elif k % 8 == 3:
+                changes.append(("pg", f"p{r}_{k - 3}", False,
+                                [tool, "-D", f"p{r}_{k - 3}", "vswitch0"]))
             else:
                 changes.append(("pg", f"p{r}_{k}", True, [tool, "-A", f"p{r}_{k}", "vswitch0"]))
         log = os.path.join(work, f"log{r}")
@@ -72,7 +82,8 @@ def main():
             in_flight_kills += 1
         for k in sorted(started):
             kind, name, present, _ = changes[k]
-            expected[kind][name] = {present} if k in acked else {present, not present}
+            if kind != "link":
+                expected[kind][name] = {present} if k in acked else {present, not present}
 
         tables = host.dump()["tables"]
         check = host.run("sqlite3", host.db, "PRAGMA integrity_check")
@@ -85,6 +96,12 @@ def main():
             if layer and (pgs != seen["pg"] or switches != seen["switch"]):
                 failures.append(f"round {r}: the layers differ")
             seen["pg"], seen["switch"] = pgs, switches
+            links = sorted(l["pnic"] for l in tables["link"]
+                           if l["layer"] == layer and l["switch"] == "cs")
+            (cs,) = [v for v in tables["vswitch"] if v["layer"] == layer and v["name"] == "cs"]
+            if sorted(cs["policy"]["uplinkOrder"]) != links:
+                failures.append(f"round {r}: layer {layer}: cs linked to {links} but its order is "
+                                f"{cs['policy']['uplinkOrder']}")
         for kind, states in expected.items():
             for name, allowed in states.items():
                 if (name in seen[kind]) not in allowed:

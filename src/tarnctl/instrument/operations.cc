@@ -31,23 +31,15 @@ size_t Distance(std::string_view a, std::string_view b) {
   return row[b.size()];
 }
 
-// The names of a space-separated list.
-std::vector<std::string_view> Words(std::string_view list) {
-  std::vector<std::string_view> words;
+// Calls `each` with every name of a space-separated list.
+template <typename Each>
+void ForEachWord(std::string_view list, Each each) {
   for (size_t at = 0; at < list.size();) {
     size_t end = list.find(' ', at);
     if (end == std::string_view::npos) end = list.size();
-    words.push_back(list.substr(at, end - at));
+    each(list.substr(at, end - at));
     at = end + 1;
   }
-  return words;
-}
-
-bool Contains(std::string_view list, std::string_view name) {
-  for (const auto word : Words(list)) {
-    if (word == name) return true;
-  }
-  return false;
 }
 
 }  // namespace
@@ -55,14 +47,18 @@ bool Contains(std::string_view list, std::string_view name) {
 const std::vector<Operation>& Operations() {
   static const std::vector<Operation> operations = [] {
     std::vector<Operation> all;
-    for (const auto name : Words(kOperationNames)) {
-      unsigned targets = kNoTarget;
-      for (const TargetList& list : kTargetLists) {
-        if (Contains(list.operations, name)) targets |= list.kinds;
-      }
-      all.push_back(
-          {static_cast<Op>(all.size()), std::string(name), targets, !Contains(kUnfaultable, name)});
+    ForEachWord(kOperationNames, [&](std::string_view name) {
+      all.push_back({static_cast<Op>(all.size()), std::string(name), kNoTarget, true});
+    });
+    auto find = [&](std::string_view name) {
+      return std::lower_bound(all.begin(), all.end(), name,
+                              [](const Operation& o, std::string_view n) { return o.name < n; });
+    };
+    for (const TargetList& list : kTargetLists) {
+      ForEachWord(list.operations,
+                  [&](std::string_view name) { find(name)->targets |= list.kinds; });
     }
+    ForEachWord(kUnfaultable, [&](std::string_view name) { find(name)->faultable = false; });
     return all;
   }();
   return operations;

@@ -23,6 +23,20 @@ constexpr int kBusyTimeoutMs = 5000;
 
 std::atomic<uint64_t> g_serials{0};
 
+// A process of this library uses its connections from one thread at a time
+// (the host's lock admits one process, and the programs are single
+// threaded): SQLite's own mutexes and memory statistics would only cost.
+// REQUIRES: before the first connection; runs once.
+void ConfigureOnce() {
+  static const bool configured = [] {
+    sqlite3_config(SQLITE_CONFIG_SINGLETHREAD);
+    sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
+    sqlite3_config(SQLITE_CONFIG_LOOKASIDE, 256, 256);
+    return true;
+  }();
+  (void)configured;
+}
+
 }  // namespace
 
 struct Statement::Cached {
@@ -112,6 +126,7 @@ Db::~Db() {
 }
 
 std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& path) {
+  ConfigureOnce();
   sqlite3* handle = nullptr;
   const int rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
   if (handle != nullptr) sqlite3_busy_timeout(handle, kBusyTimeoutMs);
@@ -122,6 +137,7 @@ std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& pat
 }
 
 std::unique_ptr<Db> Db::OpenMemory(const std::string& name) {
+  ConfigureOnce();
   sqlite3* handle = nullptr;
   const int rc = sqlite3_open_v2(":memory:", &handle, SQLITE_OPEN_READWRITE, nullptr);
   std::unique_ptr<Db> db(new Db(handle, name));

@@ -10,7 +10,7 @@ namespace TarnCtl::Store::Meta {
 int64_t NextSeq(Db& db) {
   assert(db.depth() > 0 && "the ordering counter moves inside a transaction");
   auto next = db.Prepare(
-      "UPDATE meta SET value = CAST(value AS INTEGER) + 1 WHERE key = 'next_seq' "
+      "UPDATE meta SET value = CAST(CAST(value AS INTEGER) + 1 AS TEXT) WHERE key = 'next_seq' "
       "RETURNING CAST(value AS INTEGER) - 1");
   if (!next.Step()) throw db.Error("the ordering counter is missing");
   const int64_t value = next.Int(0);
