@@ -59,3 +59,19 @@ Failures reading the port group list or names are fatal.
   Management 20
   pg1 16
   pg2 20
+
+Names that would forge a line (a newline, an escape sequence, a comma in a
+switch name) are refused, and the trace stays one line per call.
+
+  $ export TARN_TRACE=$PWD/trace
+  $ orvocfg-vswitch -A "$(printf 'pg\nRemovePortGroup("Management") on vswitch0')" vswitch0 2>&1 | tail -1
+  RemovePortGroup("Management") on vswitch0 to vswitch: vswitch0, Error: Portgroup name contains a control character
+  $ orvocfg-vswitch -a "$(printf 'vs\033[2J')"; orvocfg-vswitch -a vs,1
+  Failed to add vswitch: vs\x1b[2J, Error: Virtual switch name contains a control character (esc)
+  Failed to add vswitch: vs,1, Error: Virtual switch name vs,1 contains a comma
+  [1]
+  $ grep -cv '^[A-Za-z:]*(' trace
+  0
+  [1]
+  $ grep AddPortGroup trace
+  AddPortGroup("pg\nRemovePortGroup(\"Management\") on vswitch0") on vswitch0

@@ -10,6 +10,7 @@
 #include "hostctl/records.h"
 #include "tarnctl/admin/host.h"
 #include "tarnctl/admin/state.h"
+#include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/trace.h"
 #include "tarnctl/model/words.h"
 #include "tarnctl/store/distributed.h"
@@ -180,6 +181,7 @@ std::vector<std::string> FaultLines(Db& db) {
 
 std::string Host::Show() {
   Db& db = state_->db();
+  Instrument::Scope scope(db, "Show");
   std::string out = "Physical NICs: " + Join(Store::Pnics::Names(db)) + "\n";
 
   out += "\nRunning state\n";

@@ -22,6 +22,7 @@ namespace {
 constexpr int kBusyTimeoutMs = 5000;
 
 std::atomic<uint64_t> g_serials{0};
+Db::Observer g_observer = nullptr;
 
 // A process of this library uses its connections from one thread at a time
 // (the host's lock admits one process, and the programs are single
@@ -148,6 +149,7 @@ std::unique_ptr<Db> Db::OpenMemory(const std::string& name) {
 Statement Db::Prepare(const std::string& sql) {
   auto found = cache_->statements.find(sql);
   if (found != cache_->statements.end()) return Statement(*this, found->second.get());
+  if (g_observer != nullptr) g_observer(sql, context_);
   auto cached = std::make_unique<Statement::Cached>();
   if (sqlite3_prepare_v3(handle_, sql.c_str(), static_cast<int>(sql.size()),
                          SQLITE_PREPARE_PERSISTENT, &cached->stmt, nullptr) != SQLITE_OK) {
@@ -156,6 +158,10 @@ Statement Db::Prepare(const std::string& sql) {
   Statement::Cached* raw = cached.get();
   cache_->statements.emplace(sql, std::move(cached));
   return Statement(*this, raw);
+}
+
+void Db::Observe(Observer observer) {
+  g_observer = observer;
 }
 
 void Db::Exec(const std::string& sql) {

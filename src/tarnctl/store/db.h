@@ -95,6 +95,12 @@ class Db {
   // Transaction nesting (transaction.h keeps it).
   int depth() const { return depth_; }
 
+  // Called with the SQL text and context() of every statement a
+  // connection of this process prepares, once per connection (for the test
+  // that checks every statement's query plan). Null: nothing is called.
+  using Observer = void (*)(const std::string& sql, const char* context);
+  static void Observe(Observer observer);
+
   // The database failure `cause` on this file.
   HostCtl::Lib::HostCtlException Error(const std::string& cause) const;
   [[noreturn]] void Fail() const;

@@ -43,38 +43,39 @@ void Rebuild(Db& db, bool empty) {
 }
 
 void Reboot(Db& db) {
-  db.Exec(R"sql(
-    DELETE FROM vswitch WHERE layer = 1;
-    DELETE FROM portgroup WHERE layer = 1;
-    DELETE FROM link WHERE layer = 1;
-    DELETE FROM dvswitch WHERE layer = 1;
-    DELETE FROM dvs_uplink WHERE layer = 1;
-    DELETE FROM uplink_timeout WHERE layer = 1;
-    DELETE FROM lag_timeout WHERE layer = 1;
-    DELETE FROM ens;
-    UPDATE meta SET value = '0' WHERE key = 'ens_node';
-  )sql");
+  for (const char* sql :
+       {"DELETE FROM vswitch WHERE layer = 1", "DELETE FROM portgroup WHERE layer = 1",
+        "DELETE FROM link WHERE layer = 1", "DELETE FROM dvswitch WHERE layer = 1",
+        "DELETE FROM dvs_uplink WHERE layer = 1", "DELETE FROM uplink_timeout WHERE layer = 1",
+        "DELETE FROM lag_timeout WHERE layer = 1", "DELETE FROM ens",
+        "UPDATE meta SET value = '0' WHERE key = 'ens_node'"}) {
+    db.Prepare(sql).Run();
+  }
 }
 
 void RestoreStandard(Db& db) {
-  db.Exec(R"sql(
+  db.Prepare(R"sql(
     INSERT INTO vswitch(layer, name, seq, num_ports, mtu, cdp, system, policy)
       SELECT 1, name, seq, num_ports, mtu, cdp, system, policy FROM vswitch s
       WHERE s.layer = 0
         AND NOT EXISTS (SELECT 1 FROM vswitch r WHERE r.layer = 1 AND r.name = s.name)
         AND NOT EXISTS (SELECT 1 FROM dvswitch d
                         WHERE d.layer = 1 AND (d.name = s.name OR d.portset = s.name))
-        AND NOT EXISTS (SELECT 1 FROM opaque o WHERE o.name = s.name OR o.portset = s.name);
+        AND NOT EXISTS (SELECT 1 FROM opaque o WHERE o.name = s.name OR o.portset = s.name)
+  )sql")
+      .Run();
+  db.Prepare(R"sql(
     INSERT INTO portgroup(layer, name, switch, seq, vlan, policy)
       SELECT 1, name, switch, seq, vlan, policy FROM portgroup s
       WHERE s.layer = 0
         AND NOT EXISTS (SELECT 1 FROM portgroup r WHERE r.layer = 1 AND r.name = s.name)
-        AND EXISTS (SELECT 1 FROM vswitch r WHERE r.layer = 1 AND r.name = s.switch);
-  )sql");
+        AND EXISTS (SELECT 1 FROM vswitch r WHERE r.layer = 1 AND r.name = s.switch)
+  )sql")
+      .Run();
 }
 
 void RestoreDistributed(Db& db) {
-  db.Exec(R"sql(
+  db.Prepare(R"sql(
     INSERT INTO dvswitch(layer, name, portset, switch_id, uuid, impl_class, version, num_ports,
                          mtu, seq)
       SELECT 1, name, portset, switch_id, uuid, impl_class, version, num_ports, mtu, seq
@@ -87,15 +88,19 @@ void RestoreDistributed(Db& db) {
         AND NOT EXISTS (SELECT 1 FROM vswitch v
                         WHERE v.layer = 1 AND v.name IN (s.name, s.portset))
         AND NOT EXISTS (SELECT 1 FROM opaque o
-                        WHERE o.name IN (s.name, s.portset) OR o.portset IN (s.name, s.portset));
+                        WHERE o.name IN (s.name, s.portset) OR o.portset IN (s.name, s.portset))
+  )sql")
+      .Run();
+  db.Prepare(R"sql(
     INSERT INTO dvs_uplink(layer, pnic, dvs, port_id, seq)
       SELECT 1, pnic, dvs, port_id, seq FROM dvs_uplink s
       WHERE s.layer = 0
         AND EXISTS (SELECT 1 FROM dvswitch d WHERE d.layer = 1 AND d.name = s.dvs)
         AND NOT EXISTS (SELECT 1 FROM dvs_uplink r WHERE r.layer = 1 AND r.pnic = s.pnic)
         AND NOT EXISTS (SELECT 1 FROM link l WHERE l.layer = 1 AND l.pnic = s.pnic)
-        AND NOT EXISTS (SELECT 1 FROM opaque o, json_each(o.uplinks) u WHERE u.value = s.pnic);
-  )sql");
+        AND NOT EXISTS (SELECT 1 FROM opaque o, json_each(o.uplinks) u WHERE u.value = s.pnic)
+  )sql")
+      .Run();
 }
 
 }  // namespace TarnCtl::Store::Reset

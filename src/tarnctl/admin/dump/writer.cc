@@ -16,6 +16,7 @@
 #include "tarnctl/admin/dump/catalogue.h"
 #include "tarnctl/admin/host.h"
 #include "tarnctl/admin/state.h"
+#include "tarnctl/instrument/call.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/store/policy_codec.h"
 
@@ -82,6 +83,7 @@ void Append(std::string& out, const Json& json, int depth) {
 
 std::string Host::Dump(const Progress& progress) {
   Store::Db& db = state_->db();
+  Instrument::Scope scope(db, "Dump");
   int64_t total = 0;
   for (const auto& table : Dump::Tables()) total += Store::Rows::Count(db, table.Shape());
   int64_t done = 0;
