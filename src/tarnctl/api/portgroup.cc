@@ -52,9 +52,8 @@ std::string PortGroupImpl::GetName() {
 
 std::vector<std::unique_ptr<HostCtl::Network::Port>> PortGroupImpl::GetPorts() {
   TARN_CALL_ON(*state_, GetPorts);
-  state_->Row();
+  const int64_t clients = state_->Row().clients;
   std::vector<std::unique_ptr<HostCtl::Network::Port>> ports;
-  const int64_t clients = Store::PortGroups::ClientCount(state_->db(), state_->name);
   for (int64_t i = 0; i < clients; ++i) ports.push_back(std::make_unique<ClientPort>());
   return ports;
 }

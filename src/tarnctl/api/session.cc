@@ -6,6 +6,8 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "tarnctl/instrument/trace.h"
+
 namespace TarnCtl::Api {
 
 using HostCtl::Lib::HostCtlException;
@@ -82,6 +84,7 @@ std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
     new std::weak_ptr<Session>(std::move(process.session));
     process.session.reset();
   }
+  Instrument::ConfigureTrace(std::getenv("TARN_TRACE"));
   auto host = Store::HostFile::Open(location, options);
   if (host->created()) {
     std::fprintf(stderr, "created a new default host at %s\n", host->path().c_str());

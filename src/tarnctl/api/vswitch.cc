@@ -71,8 +71,9 @@ std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
   const int64_t seq = Store::Meta::NextSeq(db);
   for (Layer layer : Store::kBothLayers) Store::PortGroups::Insert(db, layer, name, seq, row);
   transaction.Commit();
-  return std::make_unique<PortGroupImpl>(
-      std::make_unique<PortGroupImpl::State>(sw.session, name, row));
+  // Read back when asked: clients waiting for a port group of this name
+  // are on it now.
+  return std::make_unique<PortGroupImpl>(std::make_unique<PortGroupImpl::State>(sw.session, name));
 }
 
 void VirtualSwitchImpl::RemovePortGroup(const std::string& name) {

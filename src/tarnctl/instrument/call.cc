@@ -14,19 +14,19 @@ Target Nothing() {
 }
 
 Target On(const std::string& name) {
-  return {name, {name}, ""};
+  return {name, {name, {}}, {}};
 }
 
 Target On(const std::string& switchName, const std::string& portsetName) {
-  return {switchName, {switchName, portsetName}, ""};
+  return {switchName, {switchName, portsetName}, {}};
 }
 
 Target Named(const std::string& argument) {
-  return {"", {argument}, ""};
+  return {{}, {argument, {}}, {}};
 }
 
-Target Of(const std::string& record) {
-  return {"", {record}, record + "::"};
+Target Of(const char* record) {
+  return {{}, {record, {}}, record};
 }
 
 Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault)
@@ -38,10 +38,12 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
     db_->set_context(g_running);
   }
   if (TraceOn()) {
-    std::string line = target.scope + operation.name + '(' + args + ')';
+    std::string line;
+    if (!target.record.empty()) line.append(target.record).append("::");
+    line += operation.name + '(' + args + ')';
     if (!target.on.empty()) {
       line += " on ";
-      AppendEscaped(line, target.on);
+      AppendEscaped(line, std::string(target.on));
     }
     WriteTraceLine(line);
   }

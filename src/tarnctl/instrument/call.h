@@ -10,6 +10,7 @@
 // database errors and refusals (errors.h) name the operation.
 #pragma once
 
+#include <array>
 #include <source_location>
 #include <string>
 #include <string_view>
@@ -25,12 +26,14 @@ class Db;
 namespace TarnCtl::Instrument {
 
 // What a call acts on: `on` follows " on " in the trace line (empty: no
-// " on"); `names` are what a fault's target may equal; `scope` precedes the
-// operation's name in the trace line.
+// " on"); `names` are what a fault's target may equal (unused ones empty);
+// `record` and "::" precede the operation's name in the trace line. The
+// texts are not owned: they outlive the call (the object's or the
+// caller's).
 struct Target {
-  std::string on;
-  std::vector<std::string> names;
-  std::string scope;
+  std::string_view on;
+  std::array<std::string_view, 2> names;
+  std::string_view record;
 };
 
 // A call of a static function or an information object with no name.
@@ -45,7 +48,7 @@ Target On(const std::string& switchName, const std::string& portsetName);
 Target Named(const std::string& argument);
 // A static function of the record class `record`: traced as
 // "<record>::<operation>(...)", matched by the record's name.
-Target Of(const std::string& record);
+Target Of(const char* record);
 
 class Call {
  public:

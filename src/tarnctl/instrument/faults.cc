@@ -30,16 +30,21 @@ std::vector<Store::Faults::Row>& Rows(Store::Db& db) {
 }
 
 bool Matches(const Store::Faults::Row& row, const char* operation,
-             const std::vector<std::string>& names) {
+             std::span<const std::string_view> names) {
   if (row.operation != operation || (row.skip <= 0 && row.times <= 0)) return false;
-  return !row.target || std::find(names.begin(), names.end(), *row.target) != names.end();
+  if (!row.target) return true;
+  for (const std::string_view name : names) {
+    if (!name.empty() && name == *row.target) return true;
+  }
+  return false;
 }
 
 }  // namespace
 
 std::optional<HostCtlException> TakeFault(Store::Db& db, const char* operation,
-                                          const std::vector<std::string>& names) {
+                                          std::span<const std::string_view> names) {
   const auto& rows = Rows(db);
+  if (rows.empty()) return std::nullopt;
   const auto row = std::find_if(rows.begin(), rows.end(), [&](const auto& candidate) {
     return Matches(candidate, operation, names);
   });

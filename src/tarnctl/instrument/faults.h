@@ -15,7 +15,9 @@
 #pragma once
 
 #include <optional>
+#include <span>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "hostctl/exception.h"
@@ -28,6 +30,6 @@ namespace TarnCtl::Instrument {
 
 // The failure a fault imposes on this call, or nothing.
 std::optional<HostCtl::Lib::HostCtlException> TakeFault(Store::Db& db, const char* operation,
-                                                        const std::vector<std::string>& names);
+                                                        std::span<const std::string_view> names);
 
 }  // namespace TarnCtl::Instrument

@@ -52,7 +52,8 @@ class BraceWriter {
 
 // The trace file of this process.
 struct TraceFile {
-  std::string path;  // what TARN_TRACE named when it was opened
+  bool configured = false;
+  std::string path;  // "" when off
   int fd = -1;
   bool broken = false;  // could not be opened or written: off
 };
@@ -168,17 +169,22 @@ void AppendArg(std::string& line, const HostCtl::Network::NicCapabilities& capab
   line += '{' + FormatArgs(capabilities.offloadBits, capabilities.reserved) + '}';
 }
 
-bool TraceOn() {
-  const char* path = std::getenv("TARN_TRACE");
-  if (path == nullptr || *path == '\0') return false;
+void ConfigureTrace(const char* path) {
   TraceFile& file = File();
-  if (file.path != path) {
-    if (file.fd >= 0) close(file.fd);
-    file = TraceFile{path, -1, false};
-    file.fd = open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOCTTY | O_NONBLOCK, 0644);
-    if (file.fd < 0) TurnOff(file, "open");
-  }
-  return !file.broken;
+  const std::string wanted = path != nullptr ? path : "";
+  file.configured = true;
+  if (wanted == file.path) return;
+  if (file.fd >= 0) close(file.fd);
+  file = TraceFile{true, wanted, -1, false};
+  if (wanted.empty()) return;
+  file.fd = open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOCTTY | O_NONBLOCK, 0644);
+  if (file.fd < 0) TurnOff(file, "open");
+}
+
+bool TraceOn() {
+  TraceFile& file = File();
+  if (!file.configured) ConfigureTrace(std::getenv("TARN_TRACE"));
+  return !file.path.empty() && !file.broken;
 }
 
 void WriteTraceLine(const std::string& line) {

@@ -89,7 +89,11 @@ std::string FormatArgs(const Args&... args) {
   return text;
 }
 
-// True while TARN_TRACE names a file that can be written.
+// Traces into the file `path` names from now on (null or empty: no trace).
+// The library's edge calls it with TARN_TRACE whenever it opens the host;
+// a process that traces before that reads TARN_TRACE once itself.
+void ConfigureTrace(const char* path);
+// True while the configured trace file can be written.
 bool TraceOn();
 // Appends `line` and a newline to the trace file. REQUIRES: TraceOn().
 void WriteTraceLine(const std::string& line);

@@ -6,10 +6,12 @@ namespace TarnCtl::Store::PortGroups {
 
 std::optional<Row> Find(Db& db, Layer layer, const std::string& name) {
   auto select =
-      Keyed(db, "SELECT switch, vlan, policy FROM portgroup WHERE layer = ?1 AND name = ?2",
+      Keyed(db,
+            "SELECT switch, vlan, policy, (SELECT count(*) FROM client WHERE portgroup = ?2)"
+            " FROM portgroup WHERE layer = ?1 AND name = ?2",
             LayerValue(layer), name);
   if (!select.Step()) return std::nullopt;
-  return Row{select.Text(0), static_cast<uint16_t>(select.Int(1)), select.Text(2)};
+  return Row{select.Text(0), static_cast<uint16_t>(select.Int(1)), select.Text(2), select.Int(3)};
 }
 
 bool Exists(Db& db, Layer layer, const std::string& name) {
@@ -34,11 +36,13 @@ void Insert(Db& db, Layer layer, const std::string& name, int64_t seq, const Row
 std::vector<Named> OnSwitch(Db& db, Layer layer, const std::string& switchName) {
   std::vector<Named> groups;
   auto select = db.Prepare(
-      "SELECT name, vlan, policy FROM portgroup WHERE layer = ? AND switch = ? ORDER BY seq");
+      "SELECT name, vlan, policy, (SELECT count(*) FROM client WHERE portgroup = p.name)"
+      " FROM portgroup p WHERE layer = ? AND switch = ? ORDER BY seq");
   select.Bind(1, LayerValue(layer)).Bind(2, switchName);
   while (select.Step()) {
     groups.push_back(
-        {select.Text(0), {switchName, static_cast<uint16_t>(select.Int(1)), select.Text(2)}});
+        {select.Text(0),
+         {switchName, static_cast<uint16_t>(select.Int(1)), select.Text(2), select.Int(3)}});
   }
   return groups;
 }

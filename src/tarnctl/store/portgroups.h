@@ -20,7 +20,8 @@ namespace TarnCtl::Store::PortGroups {
 struct Row {
   std::string switchName;
   uint16_t vlan = 0;
-  std::string policy;  // policy_codec.h, stored form
+  std::string policy;   // policy_codec.h, stored form
+  int64_t clients = 0;  // read only: the clients on the port group
 };
 
 struct Named {

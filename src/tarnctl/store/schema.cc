@@ -15,7 +15,7 @@ CREATE TABLE vswitch(layer, name, seq, num_ports, mtu, cdp, system, policy,
   PRIMARY KEY(layer, name)) WITHOUT ROWID;
 CREATE TABLE portgroup(layer, name, switch, seq, vlan, policy, PRIMARY KEY(layer, name))
   WITHOUT ROWID;
-CREATE INDEX portgroup_switch ON portgroup(layer, switch, seq);
+CREATE INDEX portgroup_switch ON portgroup(layer, switch, seq, vlan, policy);
 CREATE TABLE link(layer, pnic, switch, seq, PRIMARY KEY(layer, pnic)) WITHOUT ROWID;
 CREATE INDEX link_switch ON link(layer, switch, seq);
 CREATE TABLE client(portgroup, name, seq, PRIMARY KEY(portgroup, name)) WITHOUT ROWID;

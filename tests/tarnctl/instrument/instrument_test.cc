@@ -65,8 +65,8 @@ TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
   const std::string fifo = std::string(pattern) + "/fifo";
   ASSERT_EQ(mkfifo(fifo.c_str(), 0644), 0);
   for (const std::string& path : {fifo, std::string(pattern), std::string("/dev/full")}) {
-    setenv("TARN_TRACE", path.c_str(), 1);
     testing::internal::CaptureStderr();
+    ConfigureTrace(path.c_str());
     const bool on = TraceOn() && (WriteTraceLine("Refresh()"), TraceOn());
     const std::string said = testing::internal::GetCapturedStderr();
     EXPECT_FALSE(on) << path;
@@ -75,12 +75,12 @@ TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
   }
   // A name cannot forge a second line: the target is escaped too.
   const std::string file = std::string(pattern) + "/trace";
-  setenv("TARN_TRACE", file.c_str(), 1);
+  ConfigureTrace(file.c_str());
   {
     Call call(nullptr, TARN_OPERATION(GetVlanId), On("pg\nRemovePortGroup(\"x\") on vswitch0"),
               [] { return std::string(); });
   }
-  unsetenv("TARN_TRACE");
+  ConfigureTrace(nullptr);
   std::ifstream in(file);
   std::string line, rest;
   std::getline(in, line);
