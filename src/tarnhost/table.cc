@@ -51,8 +51,8 @@ const std::vector<Command>& Commands() {
       {.words = {"show"},
        .syntax = {.arguments = {{"NAME", Kind::Object, true}},
                   .options = {{.name = "json",
-                               .help = "as JSON for programs; with NAME, the standard switch, "
-                                       "distributed switch or port group of that name"},
+                               .help = "as JSON; with NAME, only the switch or port group "
+                                       "of that name"},
                               {.name = "dot", .help = "as a Graphviz graph"}}},
        .summary = "print the host in readable form, as JSON or as a graph",
        .help = "Prints the host file, the pnics, the running state, the stored configuration, "
