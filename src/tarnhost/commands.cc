@@ -3,6 +3,8 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <optional>
+#include <string>
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
@@ -54,8 +56,14 @@ int Init(const Args& args) {
   return 0;
 }
 
-int Show(const Args&) {
-  return Print(Host().Show());
+int Show(const Args& args) {
+  const bool json = args.Has("json"), dot = args.Has("dot");
+  if (json && dot) throw UsageError("--json and --dot exclude each other");
+  std::optional<std::string> name;
+  if (!args.Positionals().empty()) name = args.Positional(0);
+  if (name && !json) throw UsageError("NAME is shown with --json only");
+  Host host;
+  return Print(json ? host.ShowJson(name) : dot ? host.ShowDot() : host.Show());
 }
 
 int Dump(const Args&) {

@@ -49,9 +49,16 @@ const std::vector<Command>& Commands() {
                "linked to pnic0, with its port group Management.",
        .run = Init},
       {.words = {"show"},
-       .summary = "print the host in readable form",
-       .help = "Prints the pnics, the running state, the stored configuration, the distributed "
-               "switch cache, opaque switches, DVPorts, events and armed faults.",
+       .syntax = {.arguments = {{"NAME", Kind::Object, true}},
+                  .options = {{.name = "json",
+                               .help = "as JSON; with NAME, only the switch or port group "
+                                       "of that name"},
+                              {.name = "dot", .help = "as a Graphviz graph"}}},
+       .summary = "print the host in readable form, as JSON or as a graph",
+       .help = "Prints the host file, the pnics, the running state, the stored configuration, "
+               "the distributed switch cache, opaque switches, DVPorts, events and armed faults. "
+               "docs/host.md describes the JSON; 'tarnhost show --dot | dot -Tsvg > host.svg' "
+               "draws the graph.",
        .run = Show},
       {.words = {"dump"},
        .summary = "write the whole host as JSON on standard output",

@@ -19,7 +19,7 @@ standard output with status 0; without a command it is bad usage.
   default location; see 'tarnhost path'.
   
     init [--empty]                reset the host to the default host, or to an empty one
-    show                          print the host in readable form
+    show [NAME] [--json] [--dot]  print the host in readable form, as JSON or as a graph
     dump                          write the whole host as JSON on standard output
     load FILE                     replace the host with a dump (FILE - : standard input)
     reboot                        drop the running state, keep the stored configuration
@@ -75,7 +75,7 @@ also with -h or --help after them (which wins over mistakes, but not over
   >     'timeout lag 1 -h' 'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
   >   brief $args | cut -d'|' -f1-2; done
   0 usage: tarnhost pnic add ...|pnic add: add a physical NIC
-  0 usage: tarnhost show|show: print the host in readable form
+  0 usage: tarnhost show ...|show: print the host in readable form, as JSON or as a graph
   0 usage: tarnhost dvs add ...|dvs add: add a distributed switch
   0 usage: tarnhost init ...|init: reset the host to the default host, or to an empty one
   0 usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
@@ -113,6 +113,8 @@ of the command, or a hint where none is known, on standard error; status 2.
   > dvs add d1 --mtu
   > fault add GetName --skip ' 1'
   > help pnic remove
+  > show Management
+  > show --json --dot
   > EOF
   2 tarnhost: unknown command: bogus|see 'tarnhost help'
   2 tarnhost: unknown command: dumo; did you mean dump?|see 'tarnhost help'
@@ -135,6 +137,8 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: option --mtu needs a value|usage: tarnhost dvs add ...
   2 tarnhost: bad number for --skip: " 1"|usage: tarnhost fault add ...
   2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...
+  2 tarnhost: NAME is shown with --json only|usage: tarnhost show ...
+  2 tarnhost: --json and --dot exclude each other|usage: tarnhost show ...
   $ ls
   help
 
@@ -142,7 +146,7 @@ The completion (asking tarnhost) offers exactly, and the man page lists
 exactly, the commands and options of the table as the usage shows it.
 
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
-  18 commands, 18 options compared
+  18 commands, 20 options compared
 
 The default host as a dump.
 
@@ -167,6 +171,7 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   > timeout uplink vs0 u1 1 256
   > fault add GetName --times 0
   > fault add ''
+  > show --json nosuch
   > EOF
   status 1 tarnhost: Pnic pnic0 already exists
   status 1 tarnhost: Portgroup nosuch does not exist
@@ -181,6 +186,7 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   status 1 tarnhost: Invalid timeout 256
   status 1 tarnhost: Invalid times 0
   status 1 tarnhost: Fault operation is empty
+  status 1 tarnhost: No standard switch, distributed switch or port group is named nosuch
   $ tarnhost dump | cmp - before.json
 
 Seeding shows up, and a dump brings it all back.
@@ -197,7 +203,8 @@ Seeding shows up, and a dump brings it all back.
   $ tarnhost fault add -- -odd
   tarnhost: Unknown operation -odd
   [1]
-  $ tarnhost show | sed -n '1p;/^Stored/,$p'
+  $ tarnhost show | sed -n "s|$PWD|PWD|;1,2p;/^Stored/,\$p"
+  Host: PWD/host.db
   Physical NICs: pnic0, pnic1, pnic2, pnic3, pnic4
   Stored configuration
     Standard switch vswitch0: 128 ports, MTU 1500, CDP listen

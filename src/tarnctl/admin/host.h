@@ -93,9 +93,15 @@ class Host {
   void AddFault(const FaultSeed& seed);
   void ClearFaults();
 
-  // The whole host as readable text: running state, stored configuration,
-  // ENS state, timeouts, armed faults.
+  // The whole host as readable text: its file, the running state, the
+  // stored configuration, ENS state, timeouts, armed faults.
   std::string Show();
+  // The whole host as JSON for programs, or with `name` the standard
+  // switch, distributed switch and port group of that name in both layers
+  // (docs/host.md, "JSON"); refuses a name that is none of them.
+  std::string ShowJson(const std::optional<std::string>& name = std::nullopt);
+  // The whole host as a Graphviz graph (dot language).
+  std::string ShowDot();
   // The whole host as JSON (stable key and row order, ending in a newline);
   // Load(Dump()) leaves a host whose Dump() is the same text.
   std::string Dump(const Progress& progress = nullptr);

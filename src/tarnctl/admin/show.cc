@@ -1,4 +1,4 @@
-// The whole host as readable text, for people: pnics, the running state,
+// The whole host as readable text, for people: its file, pnics, the running state,
 // the stored configuration, the distributed switch cache, and what is not
 // layered (opaque switches, DVPorts, events, armed faults). Objects come in
 // creation order, so two hosts built alike show alike. The dump is the
@@ -182,7 +182,7 @@ std::vector<std::string> FaultLines(Db& db) {
 std::string Host::Show() {
   Db& db = state_->db();
   Instrument::Scope scope(db, "Show");
-  std::string out = "Physical NICs: " + Join(Store::Pnics::Names(db)) + "\n";
+  std::string out = "Host: " + Path() + "\nPhysical NICs: " + Join(Store::Pnics::Names(db)) + "\n";
 
   out += "\nRunning state\n";
   StandardSwitches(db, out, Layer::kRunning);

@@ -60,7 +60,9 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
     host.Init(true);
     host.Load(dumped);
     EXPECT_EQ(host.Dump(), dumped) << db;
-    EXPECT_EQ(host.Show(), shown) << db;
+    // The same host but for its file, which the first line names.
+    const std::string again = host.Show();
+    EXPECT_EQ(again.substr(again.find('\n')), shown.substr(shown.find('\n'))) << db;
   }
 }
 

@@ -16,8 +16,8 @@
 #include "tarnctl/admin/dump/catalogue.h"
 #include "tarnctl/admin/host.h"
 #include "tarnctl/admin/state.h"
+#include "tarnctl/admin/text_json.h"
 #include "tarnctl/instrument/call.h"
-#include "tarnctl/model/names.h"
 #include "tarnctl/store/policy_codec.h"
 
 namespace TarnCtl::Admin {
@@ -31,20 +31,6 @@ constexpr int kIndent = 2;
 // Rows stand at depth 3 of the document.
 constexpr int kRowDepth = 3;
 
-Json TextJson(const std::string& text) {
-  if (Model::IsUtf8(text)) return text;
-  static const char* hex = "0123456789abcdef";
-  std::string digits;
-  for (const unsigned char c : text) digits += {hex[c >> 4], hex[c & 15]};
-  return Json{{"hex", digits}};
-}
-
-Json NamesJson(const std::vector<std::string>& names) {
-  Json array = Json::array();
-  for (const auto& name : names) array.push_back(TextJson(name));
-  return array;
-}
-
 Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value) {
   switch (column.kind) {
     case Kind::kInt:
@@ -54,12 +40,8 @@ Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value) {
       [[fallthrough]];
     case Kind::kText:
       return TextJson(std::get<std::string>(value));
-    case Kind::kPolicy: {
-      const auto policy = Store::DecodeTeamingPolicy(std::get<std::string>(value));
-      Json json = Store::PolicyToJson(policy, Store::PolicyForm::kFull);
-      json["uplinkOrder"] = NamesJson(policy.uplinkOrder);
-      return json;
-    }
+    case Kind::kPolicy:
+      return PolicyJson(std::get<std::string>(value));
     case Kind::kNames:
       return NamesJson(Store::DecodeNameList(std::get<std::string>(value)));
   }
