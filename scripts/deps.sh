@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # Installs the Debian packages the project builds and tests with, when missing.
 set -euo pipefail
-packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev
+packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev libsimdjson-dev
           libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev
           graphviz jq)
 missing=()

@@ -258,7 +258,7 @@ A faulty dump or file is refused and the host stays as it was.
   $ head -c 300 seeded.json > cut.json
   $ refused tarnhost load cut.json
   status 1
-  tarnhost: Cannot load dump: not valid JSON: parse error at line 21, column 8: syntax error while parsing object key - unexpected end of input; expected string literal
+  tarnhost: Cannot load dump: not valid JSON: JSON document ended early in the middle of an object or array.
   $ for f in nosuch.json .; do refused tarnhost load $f; done; refused tarnhost load - < .
   status 1
   tarnhost: cannot read nosuch.json: No such file or directory

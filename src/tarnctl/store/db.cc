@@ -184,6 +184,10 @@ int64_t Db::ChangeCount() const {
   return sqlite3_total_changes64(handle_);
 }
 
+int64_t Db::LastChanges() const {
+  return sqlite3_changes64(handle_);
+}
+
 HostCtlException Db::Error(const std::string& cause) const {
   const std::string message = "Host database " + path_ + ": " + cause;
   return HostCtlException(message,

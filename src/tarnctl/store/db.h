@@ -83,6 +83,8 @@ class Db {
   // Rows inserted, changed or deleted through this connection so far.
   // Lets callers keep copies of rows and notice that they may be stale.
   int64_t ChangeCount() const;
+  // Rows the last finished statement inserted, changed or deleted.
+  int64_t LastChanges() const;
   // A number no other connection of this process had: caches keyed by a
   // connection survive its address being reused.
   uint64_t serial() const { return serial_; }

@@ -9,12 +9,15 @@ namespace TarnCtl::Store::Meta {
 
 int64_t NextSeq(Db& db) {
   assert(db.depth() > 0 && "the ordering counter moves inside a transaction");
-  auto next = db.Prepare(
-      "UPDATE meta SET value = CAST(CAST(value AS INTEGER) + 1 AS TEXT) WHERE key = 'next_seq' "
-      "RETURNING CAST(value AS INTEGER) - 1");
-  if (!next.Step()) throw db.Error("the ordering counter is missing");
-  const int64_t value = next.Int(0);
-  next.Run();
+  int64_t value = 0;
+  {
+    auto next = db.Prepare("SELECT CAST(value AS INTEGER) FROM meta WHERE key = 'next_seq'");
+    if (!next.Step()) throw db.Error("the ordering counter is missing");
+    value = next.Int(0);
+  }
+  db.Prepare("UPDATE meta SET value = ? WHERE key = 'next_seq'")
+      .Bind(1, std::to_string(value + 1))
+      .Run();
   return value;
 }
 

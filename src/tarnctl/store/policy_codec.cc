@@ -1,7 +1,7 @@
 #include "tarnctl/store/policy_codec.h"
 
+#include <algorithm>
 #include <limits>
-#include <set>
 #include <type_traits>
 
 #include "hostctl/exception.h"
@@ -85,13 +85,15 @@ class Reader {
   void RefuseUnknownKeys() {
     if (form_ != PolicyForm::kFull) return;
     for (const auto& item : object_.items()) {
-      if (!seen_.contains(item.key())) throw FormatError(where_ + item.key() + " is not a field");
+      if (std::find(seen_.begin(), seen_.end(), item.key()) == seen_.end()) {
+        throw FormatError(where_ + item.key() + " is not a field");
+      }
     }
   }
 
  private:
   const Json* Find(const char* key) {
-    seen_.insert(key);
+    seen_.push_back(key);
     const auto found = object_.find(key);
     if (found != object_.end()) return &*found;
     if (form_ == PolicyForm::kFull) throw FormatError(where_ + key + " is missing");
@@ -101,7 +103,7 @@ class Reader {
   const Json& object_;
   PolicyForm form_;
   std::string where_;
-  std::set<std::string> seen_;
+  std::vector<std::string_view> seen_;  // keys are literals
 };
 
 [[noreturn]] void Malformed(const std::string& what, const std::string& text) {

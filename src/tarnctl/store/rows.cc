@@ -17,12 +17,16 @@ int64_t Single(Db& db, const std::string& sql) {
   return select.Step() ? select.Int(0) : 0;
 }
 
-// Runs INSERT OR `conflict` of one row: whether a row went in.
-bool InsertOr(Db& db, const char* conflict, const Shape& shape, const std::vector<Value>& values) {
+std::string InsertSql(const char* conflict, const Shape& shape) {
   std::string marks;
   for (size_t i = 1; i <= shape.columns.size(); ++i) marks += (i > 1 ? ", ?" : "?");
-  auto insert = db.Prepare("INSERT OR " + std::string(conflict) + " INTO " + shape.table + "(" +
-                           ColumnList(shape) + ") VALUES (" + marks + ") RETURNING 1");
+  return "INSERT OR " + std::string(conflict) + " INTO " + shape.table + "(" + ColumnList(shape) +
+         ") VALUES (" + marks + ")";
+}
+
+// Runs `sql` with `values`: whether a row went in.
+bool InsertValues(Db& db, const std::string& sql, const std::vector<Value>& values) {
+  auto insert = db.Prepare(sql);
   for (size_t i = 0; i < values.size(); ++i) {
     const int index = static_cast<int>(i) + 1;
     if (const auto* number = std::get_if<int64_t>(&values[i])) {
@@ -33,9 +37,8 @@ bool InsertOr(Db& db, const char* conflict, const Shape& shape, const std::vecto
       insert.BindNull(index);
     }
   }
-  bool inserted = false;
-  while (insert.Step()) inserted = true;
-  return inserted;
+  insert.Run();
+  return db.LastChanges() > 0;
 }
 
 }  // namespace
@@ -60,11 +63,17 @@ void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector
 }
 
 bool Insert(Db& db, const Shape& shape, const std::vector<Value>& values) {
-  return InsertOr(db, "IGNORE", shape, values);
+  return InsertValues(db, InsertSql("IGNORE", shape), values);
 }
 
 void Replace(Db& db, const Shape& shape, const std::vector<Value>& values) {
-  InsertOr(db, "REPLACE", shape, values);
+  InsertValues(db, InsertSql("REPLACE", shape), values);
+}
+
+Inserter::Inserter(Db& db, const Shape& shape) : db_(db), sql_(InsertSql("IGNORE", shape)) {}
+
+bool Inserter::Insert(const std::vector<Value>& values) {
+  return InsertValues(db_, sql_, values);
 }
 
 void Clear(Db& db, const Shape& shape) {

@@ -27,6 +27,19 @@ struct Shape {
 void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector<Value>&)>& each);
 // Inserts a row; false when a row with its key is there already.
 bool Insert(Db& db, const Shape& shape, const std::vector<Value>& values);
+
+// Inserts rows of one shape one after the other, the statement prepared
+// once (a load inserts many).
+class Inserter {
+ public:
+  Inserter(Db& db, const Shape& shape);
+  // False when a row with its key is there already.
+  bool Insert(const std::vector<Value>& values);
+
+ private:
+  Db& db_;
+  std::string sql_;
+};
 // Inserts a row in place of the one with its key.
 void Replace(Db& db, const Shape& shape, const std::vector<Value>& values);
 void Clear(Db& db, const Shape& shape);

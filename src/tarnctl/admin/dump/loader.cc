@@ -1,7 +1,10 @@
 // Loading a dump (writer.cc describes the format) into the host.
 //
-// The document is read as a stream of events and each row is inserted as
-// soon as it is complete, so a large host is never held twice. Keys may
+// The document is read in one pass (simdjson's on-demand parser: the
+// structure and the scalars are read where they stand) and each row is
+// inserted as soon as it is read, so a large host is never held twice. A
+// row's teaming policy is read by visiting its fields, as every reader and
+// writer of a policy does. Keys may
 // come in any order, tables may be left out (they are empty), and a row may
 // leave out its "seq" (or a fault its "id"): those are assigned in file
 // order after every row is in, and meta's "next_seq" and "ens_node" are
@@ -10,13 +13,15 @@
 // found is refused naming its table, row and field, and the host is left
 // as it was (the load is one transaction).
 #include <algorithm>
+#include <limits>
 #include <map>
 #include <optional>
 #include <set>
 #include <string>
+#include <type_traits>
 #include <vector>
 
-#include <nlohmann/json.hpp>
+#include <simdjson.h>
 
 #include "tarnctl/admin/dump/catalogue.h"
 #include "tarnctl/admin/host.h"
@@ -26,6 +31,7 @@
 #include "tarnctl/model/names.h"
 #include "tarnctl/model/teaming.h"
 #include "tarnctl/store/policy_codec.h"
+#include "tarnctl/store/teaming_fields.h"
 #include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Admin {
@@ -36,7 +42,6 @@ using Dump::Column;
 using Dump::Kind;
 using Dump::Table;
 using HostCtl::Lib::HostCtlException;
-using Json = Store::Json;
 using Store::Rows::Value;
 
 [[noreturn]] void Bad(const std::string& why) {
@@ -71,120 +76,78 @@ std::string FromHex(const std::string& hex, bool& ok) {
   return out;
 }
 
-// Builds one row's value from parse events (rows are small).
-class RowBuilder {
- public:
-  bool active() const { return !stack_.empty(); }
-  Json& row() { return row_; }
+namespace ondemand = simdjson::ondemand;
 
-  void Begin() {
-    row_ = Json::object();
-    stack_.assign(1, &row_);
+[[noreturn]] void NotJson(simdjson::error_code error) {
+  Bad(std::string("not valid JSON: ") + simdjson::error_message(error));
+}
+
+// The value of a simdjson result, or the refusal of a document that is not
+// JSON.
+template <typename T, typename Result>
+T Must(Result&& result) {
+  T value;
+  if (const auto error = std::forward<Result>(result).get(value)) NotJson(error);
+  return value;
+}
+
+const char* TypeName(ondemand::json_type type) {
+  switch (type) {
+    case ondemand::json_type::array:
+      return "an array";
+    case ondemand::json_type::object:
+      return "an object";
+    case ondemand::json_type::number:
+      return "a number";
+    case ondemand::json_type::string:
+      return "a string";
+    case ondemand::json_type::boolean:
+      return "a boolean";
+    case ondemand::json_type::null:
+      return "null";
   }
-  void Key(std::string key) { key_ = std::move(key); }
-  void Value(Json v) { Place(std::move(v)); }
-  void Open(Json container) { stack_.push_back(Place(std::move(container))); }
-  // True when the row itself was closed.
-  bool Close() {
-    stack_.pop_back();
-    return stack_.empty();
-  }
+  return "a value";
+}
 
- private:
-  Json* Place(Json v) {
-    Json& top = *stack_.back();
-    if (top.is_array()) {
-      top.push_back(std::move(v));
-      return &top.back();
-    }
-    if (top.contains(key_)) Bad("field " + Quote(key_) + " appears twice");
-    return &(top[key_] = std::move(v));
-  }
-
-  Json row_;
-  std::vector<Json*> stack_;
-  std::string key_;
-};
-
-class Loader : public nlohmann::json_sax<Json> {
+class Loader {
  public:
   Loader(Store::Db& db, const Progress& progress) : db_(db), progress_(progress) {}
 
-  bool null() override { return Scalar(nullptr); }
-  bool boolean(bool v) override { return Scalar(v); }
-  bool number_integer(number_integer_t v) override { return Scalar(v); }
-  bool number_unsigned(number_unsigned_t v) override { return Scalar(v); }
-  bool number_float(number_float_t v, const string_t&) override { return Scalar(v); }
-  bool string(string_t& v) override { return Scalar(v); }
-  bool binary(binary_t&) override { Bad("binary values are not allowed"); }
-
-  bool start_object(std::size_t) override {
-    if (row_.active()) {
-      row_.Open(Json::object());
-    } else if (level_ == 0) {
-      level_ = 1;
-    } else if (level_ == 1 && topKey_ == "tables") {
-      level_ = 2;
-    } else if (level_ == 3) {
-      row_.Begin();
-    } else {
-      Misplaced("an object");
+  void Read(const std::string& text) {
+    const simdjson::padded_string padded(text);
+    ondemand::parser parser;
+    auto document = Must<ondemand::document>(parser.iterate(padded));
+    const auto type = Must<ondemand::json_type>(document.type());
+    if (type != ondemand::json_type::object) {
+      Bad(std::string("a dump is a JSON object, not ") + TypeName(type));
     }
-    return true;
-  }
-
-  bool start_array(std::size_t) override {
-    if (row_.active()) {
-      row_.Open(Json::array());
-    } else if (level_ == 2) {
-      level_ = 3;
-      rowNumber_ = 0;
-    } else {
-      Misplaced("an array");
+    for (auto field : Must<ondemand::object>(document.get_object())) {
+      const std::string key(Must<std::string_view>(field.unescaped_key()));
+      if (key != "format" && key != "version" && key != "tables") Bad("unknown key " + Quote(key));
+      if (!topKeys_.insert(key).second) Bad("key " + Quote(key) + " appears twice");
+      ondemand::value value = Must<ondemand::value>(field.value());
+      if (key == "format") {
+        std::string_view format;
+        if (value.get_string().get(format) || format != Dump::kFormat) {
+          Bad("\"format\" must be " + Quote(Dump::kFormat));
+        }
+      } else if (key == "version") {
+        int64_t version = 0;
+        if (value.get_int64().get(version)) Bad("\"version\" must be an integer");
+        if (version != Dump::kVersion) {
+          Bad("unsupported version " + std::to_string(version) + " (this host reads version " +
+              std::to_string(Dump::kVersion) + ")");
+        }
+      } else {
+        ReadTables(value);
+      }
     }
-    return true;
+    // At the end, the document has no current location.
+    const char* rest = nullptr;
+    if (!document.current_location().get(rest)) NotJson(simdjson::TRAILING_CONTENT);
   }
 
-  bool key(string_t& k) override {
-    if (row_.active()) {
-      row_.Key(k);
-    } else if (level_ == 1) {
-      if (k != "format" && k != "version" && k != "tables") Bad("unknown key " + Quote(k));
-      if (!topKeys_.insert(k).second) Bad("key " + Quote(k) + " appears twice");
-      topKey_ = k;
-    } else {
-      table_ = Dump::FindTable(k);
-      if (table_ == nullptr) Bad("unknown table " + Quote(k));
-      if (!seenTables_.insert(k).second) Bad("table " + Quote(k) + " appears twice");
-    }
-    return true;
-  }
-
-  bool end_object() override {
-    if (row_.active()) {
-      if (row_.Close()) InsertRow(row_.row());
-    } else {
-      level_ = level_ == 2 ? 1 : 0;
-    }
-    return true;
-  }
-
-  bool end_array() override {
-    if (row_.active()) {
-      row_.Close();
-    } else {
-      level_ = 2;
-    }
-    return true;
-  }
-
-  bool parse_error(std::size_t, const std::string&, const nlohmann::detail::exception& e) override {
-    std::string what = e.what();
-    if (auto pos = what.find("] "); pos != std::string::npos) what = what.substr(pos + 2);
-    Bad("not valid JSON: " + what);
-  }
-
-  // After the last event: what depends on every row.
+  // After the last row: what depends on every row.
   void Finish() {
     for (const char* key : {"format", "version", "tables"}) {
       if (!topKeys_.count(key)) Bad("key " + Quote(key) + " is missing");
@@ -195,33 +158,32 @@ class Loader : public nlohmann::json_sax<Json> {
   }
 
  private:
-  bool Scalar(Json v) {
-    if (row_.active()) {
-      row_.Value(std::move(v));
-    } else if (level_ == 1 && topKey_ == "format") {
-      if (!v.is_string() || v.get<std::string>() != Dump::kFormat) {
-        Bad("\"format\" must be " + Quote(Dump::kFormat));
-      }
-    } else if (level_ == 1 && topKey_ == "version") {
-      if (!v.is_number_integer()) Bad("\"version\" must be an integer");
-      if (!v.is_number_unsigned() || v.get<uint64_t>() != static_cast<uint64_t>(Dump::kVersion)) {
-        Bad("unsupported version " + v.dump() + " (this host reads version " +
-            std::to_string(Dump::kVersion) + ")");
-      }
-    } else {
-      Misplaced(v.is_null() ? "null" : "a " + std::string(v.type_name()));
+  void ReadTables(ondemand::value& value) {
+    const auto type = Must<ondemand::json_type>(value.type());
+    if (type != ondemand::json_type::object) {
+      Bad(std::string("\"tables\" must be an object, not ") + TypeName(type));
     }
-    return true;
-  }
-
-  [[noreturn]] void Misplaced(const std::string& what) {
-    if (level_ == 0) Bad("a dump is a JSON object, not " + what);
-    if (level_ == 1) {
-      Bad(Quote(topKey_) + " must be " + (topKey_ == "tables" ? "an object" : "a scalar") +
-          ", not " + what);
+    for (auto field : Must<ondemand::object>(value.get_object())) {
+      const std::string name(Must<std::string_view>(field.unescaped_key()));
+      table_ = Dump::FindTable(name);
+      if (table_ == nullptr) Bad("unknown table " + Quote(name));
+      if (!seenTables_.insert(name).second) Bad("table " + Quote(name) + " appears twice");
+      auto& inserter = inserters_.try_emplace(table_->name, db_, table_->Shape()).first->second;
+      ondemand::value rows = Must<ondemand::value>(field.value());
+      const auto rowsType = Must<ondemand::json_type>(rows.type());
+      if (rowsType != ondemand::json_type::array) {
+        Bad("table " + Quote(name) + " must be an array, not " + TypeName(rowsType));
+      }
+      rowNumber_ = 0;
+      for (auto element : Must<ondemand::array>(rows.get_array())) {
+        ondemand::value row = Must<ondemand::value>(std::move(element));
+        const auto rowType = Must<ondemand::json_type>(row.type());
+        if (rowType != ondemand::json_type::object) {
+          Bad("rows of table " + Quote(name) + " must be objects, not " + TypeName(rowType));
+        }
+        ReadRow(Must<ondemand::object>(row.get_object()), inserter);
+      }
     }
-    if (level_ == 2) Bad("table " + Quote(table_->name) + " must be an array, not " + what);
-    Bad("rows of table " + Quote(table_->name) + " must be objects, not " + what);
   }
 
   [[noreturn]] void BadField(const Column& c, const std::string& why) {
@@ -239,92 +201,170 @@ class Loader : public nlohmann::json_sax<Json> {
     }
   }
 
-  std::string TextOf(const Column& c, const Json& v) {
-    if (v.is_string()) return v.get<std::string>();
-    if (v.is_object() && v.size() == 1 && v.contains("hex") && v["hex"].is_string()) {
-      bool ok = false;
-      std::string text = FromHex(v["hex"].get<std::string>(), ok);
-      if (!ok) BadField(c, "its \"hex\" text is not pairs of lower-case hex digits");
-      return text;
+  // A text field: a string, or {"hex": "<bytes in hex>"}.
+  std::string TextField(const Column& c, ondemand::value& v) {
+    const auto type = Must<ondemand::json_type>(v.type());
+    if (type == ondemand::json_type::string) {
+      return std::string(Must<std::string_view>(v.get_string()));
     }
-    BadField(c, "must be a string");
+    ondemand::object object;
+    std::string_view hex;
+    size_t fields = 0;
+    if (type != ondemand::json_type::object || v.get_object().get(object) ||
+        object.count_fields().get(fields) || fields != 1 ||
+        object.find_field_unordered("hex").get_string().get(hex)) {
+      BadField(c, "must be a string");
+    }
+    bool ok = false;
+    std::string text = FromHex(std::string(hex), ok);
+    if (!ok) BadField(c, "its \"hex\" text is not pairs of lower-case hex digits");
+    return text;
   }
 
-  std::vector<std::string> NamesOf(const Column& c, const Json& v) {
-    if (!v.is_array()) BadField(c, "must be an array of names");
+  std::vector<std::string> NamesField(const Column& c, ondemand::value& v) {
+    ondemand::array array;
+    if (v.get_array().get(array)) BadField(c, "must be an array of names");
     std::vector<std::string> names;
     std::set<std::string> seen;
-    for (const auto& item : v) {
-      names.push_back(TextOf(c, item));
+    for (auto element : array) {
+      ondemand::value name = Must<ondemand::value>(std::move(element));
+      names.push_back(TextField(c, name));
       Apply(c, [&] { Model::CheckName(Model::NameKind::kPnic, names.back()); });
       if (!seen.insert(names.back()).second) BadField(c, "names " + names.back() + " twice");
     }
     return names;
   }
 
-  Value ValueOf(const Column& c, const Json& v) {
+  // Reads a teaming policy in its full form (every field, nothing else),
+  // visiting its fields as every reader and writer of a policy does.
+  class PolicyReader {
+   public:
+    PolicyReader(Loader& loader, const Column& c, ondemand::value& v, std::string where)
+        : loader_(loader), column_(c), where_(std::move(where)) {
+      if (v.get_object().get(object_) || object_.count_fields().get(fields_)) {
+        Fail("must be an object");
+      }
+    }
+
+    template <typename T>
+    void Number(const char* key, T& value) {
+      ondemand::value field = Find(key);
+      bool fits = false;
+      if constexpr (std::is_signed_v<T>) {
+        int64_t number = 0;
+        fits = !field.get_int64().get(number) && number >= std::numeric_limits<T>::min() &&
+               number <= std::numeric_limits<T>::max();
+        value = static_cast<T>(number);
+      } else {
+        uint64_t number = 0;
+        fits = !field.get_uint64().get(number) && number <= std::numeric_limits<T>::max();
+        value = static_cast<T>(number);
+      }
+      if (!fits) {
+        Fail(std::string(key) + " must be an integer from " +
+             std::to_string(std::numeric_limits<T>::min()) + " to " +
+             std::to_string(std::numeric_limits<T>::max()));
+      }
+    }
+    void Names(const char* key, std::vector<std::string>& names) {
+      ondemand::value field = Find(key);
+      ondemand::array array;
+      if (field.get_array().get(array)) Fail(std::string(key) + " must be an array of names");
+      names.clear();
+      for (auto element : array) {
+        ondemand::value name = Must<ondemand::value>(std::move(element));
+        names.push_back(loader_.TextField(column_, name));
+      }
+    }
+    template <typename Inside>
+    void Group(const char* key, Inside inside) {
+      ondemand::value field = Find(key);
+      PolicyReader reader(loader_, column_, field, where_ + key + ".");
+      inside(reader);
+      reader.RefuseOthers();
+    }
+    // After the visit: the object holds no field that was not asked for.
+    void RefuseOthers() {
+      if (fields_ != asked_) Fail("holds a key that is not a field, or one twice");
+    }
+
+   private:
+    ondemand::value Find(const char* key) {
+      ++asked_;
+      ondemand::value field;
+      if (object_.find_field_unordered(key).get(field)) Fail(std::string(key) + " is missing");
+      return field;
+    }
+    [[noreturn]] void Fail(const std::string& why) { loader_.BadField(column_, where_ + why); }
+
+    Loader& loader_;
+    const Column& column_;
+    std::string where_;
+    ondemand::object object_;
+    size_t fields_ = 0;
+    size_t asked_ = 0;
+  };
+
+  Value ValueOf(const Column& c, ondemand::value& v) {
     switch (c.kind) {
       case Kind::kInt: {
-        if (!v.is_number_integer()) BadField(c, "must be an integer");
-        if (v.is_number_unsigned() && v.get<uint64_t>() > uint64_t{INT64_MAX}) {
-          BadField(c, "is too large");
+        int64_t number = 0;
+        if (const auto error = v.get_int64().get(number)) {
+          BadField(c,
+                   error == simdjson::NUMBER_OUT_OF_RANGE ? "is too large" : "must be an integer");
         }
-        const int64_t number = v.get<int64_t>();
         Apply(c, [&] { Model::Check(*c.range, number); });
         return number;
       }
       case Kind::kOptText:
-        if (v.is_null()) return std::monostate{};
+        if (Must<bool>(v.is_null())) return std::monostate{};
         [[fallthrough]];
       case Kind::kText: {
-        std::string text = TextOf(c, v);
+        std::string text = TextField(c, v);
         if (c.name_rule) Apply(c, [&] { Model::CheckName(*c.name_rule, text); });
         if (c.rule != nullptr) Apply(c, [&] { c.rule(text); });
         return text;
       }
       case Kind::kPolicy: {
-        Json policy = v;
-        if (v.is_object() && v.contains("uplinkOrder") && v["uplinkOrder"].is_array()) {
-          for (auto& name : policy["uplinkOrder"]) name = TextOf(c, name);
-        }
-        HostCtl::Network::NicTeamingPolicy decoded;
-        try {
-          decoded = Store::PolicyFromJson(policy, Store::PolicyForm::kFull);
-        } catch (const Store::FormatError& e) {
-          BadField(c, e.what());
-        }
-        Apply(c, [&] { Model::CheckTeamingPolicy(decoded); });
-        return Store::EncodeTeamingPolicy(decoded);
+        HostCtl::Network::NicTeamingPolicy policy;
+        PolicyReader reader(*this, c, v, "");
+        Store::VisitTeamingFields(policy, reader);
+        reader.RefuseOthers();
+        Apply(c, [&] { Model::CheckTeamingPolicy(policy); });
+        return Store::EncodeTeamingPolicy(policy);
       }
       case Kind::kNames:
-        return Store::EncodeNameList(NamesOf(c, v));
+        return Store::EncodeNameList(NamesField(c, v));
     }
     return std::monostate{};
   }
 
-  void InsertRow(const Json& row) {
+  void ReadRow(ondemand::object row, Store::Rows::Inserter& inserter) {
     ++rowNumber_;
     const Table& t = *table_;
-    for (const auto& item : row.items()) {
-      bool known = false;
-      for (const auto& c : t.columns) known = known || item.key() == c.name;
-      if (!known) {
+    std::vector<Value> values(t.columns.size());
+    std::vector<bool> given(t.columns.size());
+    for (auto field : row) {
+      const std::string_view key = Must<std::string_view>(field.unescaped_key());
+      size_t i = 0;
+      while (i < t.columns.size() && key != t.columns[i].name) ++i;
+      if (i == t.columns.size()) {
         Bad("table " + Quote(t.name) + ", row " + std::to_string(rowNumber_) + ": unknown field " +
-            Quote(item.key()));
+            Quote(std::string(key)));
       }
+      if (given[i]) Bad("field " + Quote(std::string(key)) + " appears twice");
+      given[i] = true;
+      ondemand::value value = Must<ondemand::value>(field.value());
+      values[i] = ValueOf(t.columns[i], value);
     }
-    std::vector<Value> values;
-    for (const Column& c : t.columns) {
-      if (!row.contains(c.name)) {
-        if (t.counter == nullptr || std::string(c.name) != t.counter) BadField(c, "is missing");
-        // A placeholder, assigned in Finish().
-        values.emplace_back(std::in_place_type<int64_t>, -++placeholders_);
-        continue;
-      }
-      values.push_back(ValueOf(c, row[c.name]));
+    for (size_t i = 0; i < t.columns.size(); ++i) {
+      if (given[i]) continue;
+      const Column& c = t.columns[i];
+      if (t.counter == nullptr || std::string(c.name) != t.counter) BadField(c, "is missing");
+      values[i] = -++placeholders_;  // a placeholder, assigned in Finish()
     }
     CheckRow(t, values);
-    if (!Store::Rows::Insert(db_, t.Shape(), values)) {
+    if (!inserter.Insert(values)) {
       Bad("table " + Quote(t.name) + ", row " + std::to_string(rowNumber_) +
           ": repeats the key of an earlier row");
     }
@@ -407,8 +447,6 @@ class Loader : public nlohmann::json_sax<Json> {
 
   Store::Db& db_;
   const Progress& progress_;
-  int level_ = 0;  // 1: top object, 2: tables, 3: a table's rows
-  std::string topKey_;
   std::set<std::string> topKeys_;
   std::set<std::string> seenTables_;
   const Table* table_ = nullptr;
@@ -416,7 +454,7 @@ class Loader : public nlohmann::json_sax<Json> {
   int64_t rows_ = 0;
   int64_t placeholders_ = 0;
   std::map<std::string, std::string> meta_;
-  RowBuilder row_;
+  std::map<std::string, Store::Rows::Inserter> inserters_;
 };
 
 }  // namespace
@@ -427,7 +465,7 @@ void Host::Load(const std::string& text, const Progress& progress) {
   Store::Transaction transaction(db);
   for (const auto& table : Dump::Tables()) Store::Rows::Clear(db, table.Shape());
   Loader loader(db, progress);
-  Json::sax_parse(text, &loader);
+  loader.Read(text);
   loader.Finish();
   transaction.Commit();
 }

@@ -12,6 +12,7 @@
 // The host is not held twice: each row is made a JSON value and written
 // into the text at once.
 #include <string>
+#include <unordered_map>
 
 #include "tarnctl/admin/dump/catalogue.h"
 #include "tarnctl/admin/host.h"
@@ -31,7 +32,20 @@ constexpr int kIndent = 2;
 // Rows stand at depth 3 of the document.
 constexpr int kRowDepth = 3;
 
-Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value) {
+// The JSON of each stored policy text met so far: most rows share a few.
+class Policies {
+ public:
+  const Json& Of(const std::string& stored) {
+    auto found = known_.find(stored);
+    if (found == known_.end()) found = known_.emplace(stored, PolicyJson(stored)).first;
+    return found->second;
+  }
+
+ private:
+  std::unordered_map<std::string, Json> known_;
+};
+
+Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value, Policies& policies) {
   switch (column.kind) {
     case Kind::kInt:
       return std::get<int64_t>(value);
@@ -41,25 +55,22 @@ Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value) {
     case Kind::kText:
       return TextJson(std::get<std::string>(value));
     case Kind::kPolicy:
-      return PolicyJson(std::get<std::string>(value));
+      return policies.Of(std::get<std::string>(value));
     case Kind::kNames:
       return NamesJson(Store::DecodeNameList(std::get<std::string>(value)));
   }
   return nullptr;
 }
 
-// Appends `json` as it stands at `depth` of the document.
+// Appends `json` as it stands at `depth` of the document: the JSON
+// library's own pretty printer, told where it starts.
 void Append(std::string& out, const Json& json, int depth) {
-  const std::string text = json.dump(kIndent);
-  const std::string newline = "\n" + std::string(kIndent * depth, ' ');
-  for (const char c : text) {
-    if (c == '\n') {
-      out += newline;
-    } else {
-      out += c;
-    }
-  }
+  nlohmann::detail::serializer<Json> printer(
+      nlohmann::detail::output_adapter<char, std::string>(out), ' ',
+      nlohmann::detail::error_handler_t::strict);
+  printer.dump(json, true, false, kIndent, kIndent * depth);
 }
+
 
 }  // namespace
 
@@ -69,6 +80,7 @@ std::string Host::Dump(const Progress& progress) {
   int64_t total = 0;
   for (const auto& table : Dump::Tables()) total += Store::Rows::Count(db, table.Shape());
   int64_t done = 0;
+  Policies policies;
 
   std::string out = "{\n  \"format\": ";
   Append(out, Dump::kFormat, 1);
@@ -80,10 +92,10 @@ std::string Host::Dump(const Progress& progress) {
     Append(out, table.name, 2);
     out += ": [";
     bool firstRow = true;
+    Json row = Json::object();
     Store::Rows::Scan(db, table.Shape(), [&](const std::vector<Store::Rows::Value>& values) {
-      Json row = Json::object();
       for (size_t i = 0; i < values.size(); ++i) {
-        row[table.columns[i].name] = ValueJson(table.columns[i], values[i]);
+        row[table.columns[i].name] = ValueJson(table.columns[i], values[i], policies);
       }
       out += firstRow ? "\n      " : ",\n      ";
       firstRow = false;
