@@ -2,7 +2,8 @@
 # Installs the Debian packages the project builds and tests with, when missing.
 set -euo pipefail
 packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev
-          libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev)
+          libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev
+          lintian)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
