@@ -3,7 +3,7 @@
 set -euo pipefail
 packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev libsimdjson-dev
           libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev
-          graphviz jq)
+          graphviz jq lintian)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")

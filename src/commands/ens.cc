@@ -4,11 +4,14 @@
 #include <signal.h>
 #include <sys/types.h>
 
+#include <charconv>
 #include <cstdint>
 #include <cstdlib>
 #include <fstream>
 #include <iostream>
 #include <limits>
+#include <optional>
+#include <string>
 
 #include "commands/commands.h"
 #include "hostctl/nodi.h"
@@ -22,13 +25,28 @@ constexpr const char kPidMaxFile[] = "/proc/sys/kernel/pid_max";
 // Version argument of the node interface's signature check.
 constexpr int kNodiSigVersion = 21;
 
+// The one number a file holds: decimal digits only, with white space around
+// them. A sign, other characters or a value beyond 32 bits give nothing
+// (operator>> would take "-1" and wrap it to a large unsigned value).
+std::optional<uint32_t> ReadDecimal(std::istream& in) {
+  std::string word;
+  in >> word >> std::ws;
+  uint32_t value = 0;
+  const char* end = word.data() + word.size();
+  const auto [stop, error] = std::from_chars(word.data(), end, value);
+  if (error != std::errc() || stop != end || in.peek() != std::char_traits<char>::eof()) {
+    return std::nullopt;
+  }
+  return value;
+}
+
 // One above the largest process id of this system; when the kernel does not
 // say, every value that stays positive as a pid_t.
 uint64_t PidLimit() {
   uint64_t limit = static_cast<uint64_t>(std::numeric_limits<pid_t>::max()) + 1;
   std::ifstream in(kPidMaxFile);
-  uint64_t pidMax = 0;
-  if (in >> pidMax && pidMax > 0 && pidMax < limit) limit = pidMax;
+  const std::optional<uint32_t> pidMax = ReadDecimal(in);
+  if (pidMax && *pidMax > 0 && *pidMax < limit) limit = *pidMax;
   return limit;
 }
 
@@ -69,7 +87,7 @@ void SignalDeviceManager() {
       std::cout << "Failed to open " << kDeviceManagerPidFile << std::endl;
       std::exit(1);
     }
-    if (!(in >> pid)) pid = 0;
+    pid = ReadDecimal(in).value_or(0);
   }
   // 0 would signal our own process group; values at or above the limit name
   // no single process (and may turn negative as a pid_t).

@@ -23,27 +23,37 @@ No PID file: the message goes to standard output and nothing is reassociated.
   $ calls ReassociateEnsUplinks
   [1]
 
-A PID file naming no single process (0, no number, too large, negative):
-
-  $ for text in 0 '' abc 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648; do
-  >   printf '%s\n' "$text" > "$pidfile"
-  >   orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
-  > done | paste -d' ' - - | uniq -c
-        6 Failed to read device manager PID status 1
-  $ calls ReassociateEnsUplinks
-  [1]
-
 -z does not read the file.
 
   $ orvocfg-vswitch -z vswitch0
   $ calls ReassociateEnsUplinks
   ReassociateEnsUplinks(false, false, 0, 0) on vswitch0
 
-A valid PID (after white space) gets SIGHUP, and the reassociation is forced.
+A process of this test stands in for the device manager.
 
-  $ (sleep 30 & echo $! > sleeper; wait $!; echo "sleep ended with $?" > ended) 2>/dev/null &
+  $ (sleep 120 & echo $! > sleeper; wait $!; echo "sleep ended with $?" > ended) 2>/dev/null &
   $ until [ -s sleeper ]; do sleep 0.1; done; pid=$(cat sleeper)
-  $ printf ' \n  %s\n' "$pid" > "$pidfile"
+
+A PID file that is not plain decimal digits naming a single process: 0, no
+number, too large, over 32 bits, and the sleeper's PID with a sign, with
+characters after it, or written as a negative or wider number that wraps to
+it. Nothing is signalled and nothing is reassociated.
+
+  $ for text in 0 '' abc 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648 4294967296 \
+  >     "+$pid" "-$((4294967296 - pid))" "$((4294967296 + pid))" "${pid}x" "$pid $pid" "$pid.0"; do
+  >   printf '%s\n' "$text" > "$pidfile"
+  >   orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
+  > done | paste -d' ' - - | uniq -c
+       13 Failed to read device manager PID status 1
+  $ kill -0 "$pid" && echo "sleeper still running"
+  sleeper still running
+  $ calls ReassociateEnsUplinks
+  [1]
+
+Its PID, with white space around it, gets SIGHUP, and the reassociation is
+forced.
+
+  $ printf ' \n  %s \n\n' "$pid" > "$pidfile"
   $ orvocfg-vswitch -f vswitch0
   $ wait; pid=; cat ended
   sleep ended with 129

@@ -2,12 +2,15 @@
 # Installs a built tree into a scratch prefix and checks what a system
 # install gets: the files and where they land, that the installed programs
 # run, that the man pages render without warnings and document every option
-# the parser accepts, and that the bash completions load and complete.
+# the parser accepts, and that the bash completions load and complete. Then,
+# when lintian is installed, builds the Debian package and checks it.
 #
-# Usage: install_test.sh BUILD_DIR SOURCE_DIR
+# Usage: install_test.sh BUILD_DIR SOURCE_DIR VERSION SANITIZED(1|0)
 set -uo pipefail
 build=$(cd "$1" && pwd)
 source_dir=$(cd "$2" && pwd)
+version=$3
+sanitized=$4
 tmp=$(mktemp -d)
 trap 'rm -rf "$tmp"' EXIT
 root=$tmp/root
@@ -24,17 +27,20 @@ if ! cmake --install "$build" --prefix "$root" >"$tmp/install.log" 2>&1; then
     exit 1
 fi
 
-# tarnhost and its page and completion come with its target.
+# tarnhost and its page and completion come with its target. orvocfg-vswitch
+# is a system tool (sbin); tarnhost also serves users' own hosts (bin).
 commands=(orvocfg-vswitch)
+declare -A program=([orvocfg-vswitch]=sbin/orvocfg-vswitch [tarnhost]=bin/tarnhost)
 [ -x "$build/bin/tarnhost" ] && commands+=(tarnhost)
 
-expected=("share/doc/orvocfg-vswitch/README.md")
+doc=share/doc/orvocfg-vswitch
+expected=("$doc/README.md" "$doc/copyright" "$doc/changelog.gz")
 for c in "${commands[@]}"; do
-    expected+=("sbin/$c" "share/man/man8/$c.8.gz" "share/bash-completion/completions/$c")
+    expected+=("${program[$c]}" "share/man/man8/$c.8.gz" "share/bash-completion/completions/$c")
 done
 for f in "${expected[@]}"; do
     [ -f "$root/$f" ] || fail "not installed: $f"
-    [[ $f != sbin/* || -x "$root/$f" ]] || fail "not executable: $f"
+    [[ $f != *bin/* || -x "$root/$f" ]] || fail "not executable: $f"
 done
 # Nothing else: no libraries, test programs or man sources among the docs.
 while IFS= read -r f; do
@@ -44,18 +50,38 @@ while IFS= read -r f; do
 done < <(cd "$root" && find . -type f | sed 's|^\./||')
 
 # The installed programs run, and work on a host of their own.
-usage=$("$root/sbin/orvocfg-vswitch" -h)
+usage=$("$root/${program[orvocfg-vswitch]}" -h)
 [ $? -eq 0 ] || fail "orvocfg-vswitch -h did not exit with 0"
 first=${usage%%$'\n'*}
 [ "$first" = "orvocfg-vswitch [options] [vswitch[:ports]]" ] ||
     fail "orvocfg-vswitch -h printed '$first' first"
-if [ -x "$root/sbin/tarnhost" ]; then
+if [ -x "$root/${program[tarnhost]}" ]; then
     export TARN_HOST_DB=$tmp/host.db
     unset TARN_TRACE
-    "$root/sbin/tarnhost" init >/dev/null || fail "installed tarnhost init failed"
-    answer=$("$root/sbin/orvocfg-vswitch" -c vswitch0)
+    "$root/${program[tarnhost]}" init >/dev/null || fail "installed tarnhost init failed"
+    answer=$("$root/${program[orvocfg-vswitch]}" -c vswitch0)
     [ "$answer" = 1 ] || fail "installed orvocfg-vswitch -c vswitch0 printed '$answer'"
 fi
+
+# Compressed files: their source (the man pages with the version on the .TH
+# line, in place of the sources' placeholder), compressed with gzip -n so
+# that they are the same from build to build.
+compressed=("$doc/changelog.gz|$source_dir/packaging/changelog")
+for c in "${commands[@]}"; do
+    compressed+=("share/man/man8/$c.8.gz|$source_dir/docs/man/$c.8")
+    th=$(sed -n '/^\.TH /p' "$source_dir/docs/man/$c.8")
+    [[ $th == *' "orvocfg-vswitch @PROJECT_VERSION@" '* ]] ||
+        fail "docs/man/$c.8: no version placeholder on the .TH line: $th"
+done
+for pair in "${compressed[@]}"; do
+    file=${pair%%|*} source=${pair#*|}
+    [ -f "$root/$file" ] || continue
+    cmp -s <(sed "s/@PROJECT_VERSION@/$version/" "$source" | gzip -9 -n) "$root/$file" ||
+        fail "$file is not ${source#"$source_dir"/}, version $version, compressed with gzip -n"
+done
+# The changelog's latest entry is this version's.
+latest=$(dpkg-parsechangelog -l "$source_dir/packaging/changelog" -S Version 2>&1)
+[ "$latest" = "$version" ] || fail "packaging/changelog: latest entry is '$latest', not $version"
 
 # Man pages: no warnings from man nor from groff, and the rendered page is
 # the right one.
@@ -68,7 +94,6 @@ for c in "${commands[@]}"; do
     grep -q "^${c^^}(8)" <<<"$out" || fail "$c.8.gz does not render as ${c^^}(8)"
     zcat "$page" | groff -man -ww -z 2>"$tmp/groff.err"
     [ -s "$tmp/groff.err" ] && fail "groff -man -ww -z $c.8: $(cat "$tmp/groff.err")"
-    cmp -s <(zcat "$page") "$source_dir/docs/man/$c.8" || fail "$c.8.gz is not docs/man/$c.8"
 done
 
 # Completion of the installed files, in a shell of its own (tarnhost's asks
@@ -76,7 +101,7 @@ done
 complete_words() { # command file words...
     local file=$1
     shift
-    PATH=$root/sbin:$PATH bash --norc --noprofile -c '
+    PATH=$root/bin:$root/sbin:$PATH bash --norc --noprofile -c '
         source "$1" || exit 1
         shift
         COMP_WORDS=("$@")
@@ -136,6 +161,43 @@ for case in "${cases[@]}"; do
         grep -qx -- "$w" <<<"$got" && fail "[$line] offers $w"
     done
 done
+
+# The Debian package, checked by lintian. Not on the sanitizer build: its
+# programs are instrumented Debug builds without hardening, which no package
+# ships and lintian would rightly refuse.
+if [ "$sanitized" = 1 ]; then
+    echo "sanitizer build: Debian package not built"
+elif ! command -v lintian >/dev/null; then
+    echo "lintian not installed: Debian package not built"
+else
+    deb=$tmp/deb/orvocfg-vswitch_${version}_amd64.deb
+    if ! cpack -G DEB --config "$build/CPackConfig.cmake" -B "$tmp/deb" >"$tmp/cpack.log" 2>&1 ||
+        [ ! -f "$deb" ]; then
+        cat "$tmp/cpack.log" >&2
+        fail "cpack -G DEB"
+    else
+        # Infos too: missing hardening and unstripped sections are infos.
+        lintian --fail-on error,warning,info --display-info "$deb" >"$tmp/lintian.log" 2>&1 ||
+            fail "lintian: $(grep -v 'running with root privileges' "$tmp/lintian.log")"
+        listing=$(dpkg-deb -c "$deb" | awk '{print $1, $NF}')
+        for c in "${commands[@]}"; do
+            grep -qx -- "-rwxr-xr-x ./usr/${program[$c]}" <<<"$listing" ||
+                fail "package lacks /usr/${program[$c]}"
+        done
+        grep -qx "drwxr-xr-x ./var/lib/tarnhost/" <<<"$listing" ||
+            fail "package lacks /var/lib/tarnhost"
+        [ "$(dpkg-deb -f "$deb" Suggests)" = bash-completion ] ||
+            fail "package does not suggest bash-completion"
+        # postrm removes root's host with its directory on purge only.
+        dpkg-deb -e "$deb" "$tmp/control"
+        state=$tmp/dpkg-root/var/lib/tarnhost
+        mkdir -p "$state" && : >"$state/host.db"
+        DPKG_ROOT=$tmp/dpkg-root "$tmp/control/postrm" remove && [ -e "$state/host.db" ] ||
+            fail "postrm remove failed or removed the host"
+        DPKG_ROOT=$tmp/dpkg-root "$tmp/control/postrm" purge && [ ! -e "$state" ] ||
+            fail "postrm purge failed or left /var/lib/tarnhost"
+    fi
+fi
 
 echo "install_test: $failures failures"
 [ "$failures" -eq 0 ]

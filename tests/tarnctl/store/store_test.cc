@@ -191,7 +191,7 @@ TEST_F(StoreTest, AnotherConnectionsTransactionIsWaitedFor) {
   if (pid == 0) {
     auto other = Db::OpenFile(Path("host.db"), "other");
     other->Exec("BEGIN EXCLUSIVE; DELETE FROM pnic WHERE name = 'pnic3'");
-    (void)write(ready[1], "x", 1);
+    if (write(ready[1], "x", 1) != 1) _exit(1);
     usleep(300 * 1000);
     other->Exec("COMMIT");
     _exit(0);
