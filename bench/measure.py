@@ -7,8 +7,10 @@
 - peak resident size, through /usr/bin/time, a small program, because a
   child's peak includes the memory of the process that forked it;
 - wall time, which does: the runs of the cases of a comparison are
-  interleaved, so that the machine's drift falls on all of them alike.
+  interleaved in rounds, so that the machine's drift falls on all of them
+  alike, and a ratio is judged by the rounds' ratios.
 """
+import math
 import os
 import re
 import shutil
@@ -154,22 +156,46 @@ def time_interleaved(cases, runs):
     return times
 
 
+# How rarely chance may decide a wall-time verdict.
+CHANCE = 0.001
+
+
+def bound_rank(n):
+    """The k for which the k-th smallest of n ratios bounds their true median
+    from below (and the k-th largest from above) but for chance CHANCE: the
+    largest k with P(Binomial(n, 1/2) < k) <= CHANCE; 0 when n is too small."""
+    k, below = 0, 0.0
+    while k < n:
+        below += math.comb(n, k) / 2 ** n
+        if below > CHANCE:
+            break
+        k += 1
+    return k
+
+
 @dataclass
 class Spread:
-    """Median, fastest and slowest of a series of wall times. The machine's
-    load only ever adds time, so a target is missed for certain only when
-    even the favourable end of the spread misses it."""
+    """A median and what bounds it (None: the runs are too few to tell)."""
     median: float
-    low: float
-    high: float
+    low: float | None
+    high: float | None
 
     @classmethod
     def of(cls, values):
+        """Wall times: the machine's load only ever adds time, so the
+        fastest run bounds the cost from below."""
         return cls(statistics.median(values), min(values), max(values))
 
-    def scaled(self, factor):
-        return Spread(self.median * factor, self.low * factor, self.high * factor)
+    @classmethod
+    def ratio(cls, num, den):
+        """num/den of wall times run in rounds (num[i] and den[i] back to
+        back): the median of the rounds' ratios and the bounds that load
+        falling on either side at random crosses less than once in
+        1/CHANCE times."""
+        r = sorted(a / b for a, b in zip(num, den))
+        k = bound_rank(len(r))
+        return cls(statistics.median(r), r[k - 1] if k else None, r[-k] if k else None)
 
-    def over(self, base):
-        """The ratio self/base: its median and the bounds the spreads allow."""
-        return Spread(self.median / base.median, self.low / base.high, self.high / base.low)
+    def scaled(self, factor):
+        return Spread(*(v * factor if v is not None else None
+                        for v in (self.median, self.low, self.high)))
