@@ -9,6 +9,8 @@ import json
 import os
 import subprocess
 
+from measure import check_exit
+
 SWITCH = "bench0"
 SWITCH_GROUPS = 10
 GROUPS_PER_SWITCH = 100
@@ -20,8 +22,11 @@ GROUP_POLICY = dict(SWITCH_POLICY, flags=0)
 
 
 def tarnhost(tarnhost_bin, env, *args):
-    return subprocess.run([tarnhost_bin, *args], env=env, check=True,
-                          stdout=subprocess.PIPE).stdout
+    """The output of `tarnhost ARGS...`; what it says on stderr only when it fails."""
+    argv = [tarnhost_bin, *args]
+    proc = subprocess.run(argv, env=env, capture_output=True)
+    check_exit(argv, proc)
+    return proc.stdout
 
 
 def switch_sizes(groups):

@@ -51,7 +51,8 @@ class Failed(Exception):
     pass
 
 
-def _check(argv, proc):
+def check_exit(argv, proc):
+    """Raises Failed, with what argv said on stderr, unless it exited with 0."""
     if proc.returncode != 0:
         err = proc.stderr.decode(errors="replace") if proc.stderr else ""
         raise Failed(f"{' '.join(argv)} exited with {proc.returncode}: {err.strip()}")
@@ -62,7 +63,7 @@ def instructions(argv, env, scratch):
     out = scratch + ".callgrind"
     cmd = ["valgrind", "--tool=callgrind", "--callgrind-out-file=" + out, *argv]
     proc = subprocess.run(cmd, env=env, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE)
-    _check(argv, proc)
+    check_exit(argv, proc)
     with open(out) as f:
         for line in f:
             if line.startswith(("summary:", "totals:")):
@@ -77,7 +78,7 @@ def syscalls(argv, env, scratch, db):
     cmd = ["strace", "-f", "-qq", "--seccomp-bpf", "-y", "-s", "0", "-e", "trace=" + names,
            "-o", out, *argv]
     proc = subprocess.run(cmd, env=env, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE)
-    _check(argv, proc)
+    check_exit(argv, proc)
     fsyncs = reads = writes = 0
     db = os.path.realpath(db) if db else None
     with open(out, errors="replace") as f:
@@ -120,7 +121,7 @@ def peak_rss_kib(argv, env, scratch):
     out = scratch + ".rss"
     proc = subprocess.run(["/usr/bin/time", "-f", "%M", "-o", out, *argv], env=env,
                           stdout=subprocess.DEVNULL, stderr=subprocess.PIPE)
-    _check(argv, proc)
+    check_exit(argv, proc)
     with open(out) as f:
         return int(f.read().split()[-1])
 
