@@ -50,6 +50,7 @@ import re
 import shutil
 import sys
 import tempfile
+import time
 from dataclasses import dataclass
 
 from hosts import SWITCH, make_host, new_host, tarnhost
@@ -309,14 +310,17 @@ def main():
     work = os.path.abspath(args.keep or tempfile.mkdtemp(prefix="bench."))
     bench = Bench(os.path.abspath(args.bin_dir), runs, big, work, bool(args.keep))
     try:
-        print(f"hosts in {work}: {SMALL:,}, {LARGE:,} and {big:,} port groups; the default host",
-              flush=True)
-        bench.build_hosts()
-        print("counting: callgrind and strace, one run of each command ...", flush=True)
-        bench.count_all()
-        print(f"timing: {runs} runs of each small command, {bench.big_runs} of -l, dump and load ...",
-              flush=True)
-        bench.time_all()
+        for say, step in (
+                (f"hosts in {work}: {SMALL:,}, {LARGE:,} and {big:,} port groups; the default host",
+                 bench.build_hosts),
+                ("counting: callgrind and strace, one run of each command, two at a time",
+                 bench.count_all),
+                (f"timing: {runs} runs of each small command, {bench.big_runs} of -l, dump and load",
+                 bench.time_all)):
+            print(say, "...", end=" ", flush=True)
+            start = time.monotonic()
+            step()
+            print(f"{time.monotonic() - start:.0f} s", flush=True)
     except Failed as e:
         print(f"failed: {e}", file=sys.stderr)
         return 2
