@@ -8,7 +8,8 @@
   child's peak includes the memory of the process that forked it;
 - wall time, which does: the runs of the cases of a comparison are
   interleaved in rounds, so that the machine's drift falls on all of them
-  alike, and a ratio is judged by the rounds' ratios.
+  alike, and a ratio is judged by the rounds' ratios; a time limit is
+  judged against the processor time too, which the load hardly moves.
 """
 import math
 import os
@@ -126,25 +127,36 @@ def peak_rss_kib(argv, env, scratch):
         return int(f.read().split()[-1])
 
 
-def wall(argv, env):
-    """Seconds from the start of argv to its end (output to /dev/null)."""
+@dataclass
+class Run:
+    """One timed run: its wall time and its processor time (user and
+    system), in seconds."""
+    wall: float
+    cpu: float
+
+    def __add__(self, other):
+        return Run(self.wall + other.wall, self.cpu + other.cpu)
+
+
+def timed(argv, env):
+    """A run of argv from its start to its end (output to /dev/null)."""
     actions = [(os.POSIX_SPAWN_OPEN, 1, os.devnull, os.O_WRONLY, 0),
                (os.POSIX_SPAWN_OPEN, 2, os.devnull, os.O_WRONLY, 0)]
     start = time.perf_counter()
     pid = os.posix_spawn(argv[0], argv, env, file_actions=actions)
-    _, status, _ = os.wait4(pid, 0)
+    _, status, usage = os.wait4(pid, 0)
     elapsed = time.perf_counter() - start
     code = os.waitstatus_to_exitcode(status)
     if code != 0:
         raise Failed(f"{' '.join(argv)} exited with {code}")
-    return elapsed
+    return Run(elapsed, usage.ru_utime + usage.ru_stime)
 
 
 def time_interleaved(cases, runs):
-    """cases: {label: (env, [argv, ...], prepare)}; the wall time of each
-    case's argvs run one after the other, `runs` times, the cases taking
-    turns (in reversed order every other round); `prepare` (or None) runs
-    untimed before each round of a case. Returns {label: [seconds, ...]}."""
+    """cases: {label: (env, [argv, ...], prepare)}; each case's argvs run one
+    after the other, `runs` times, the cases taking turns (in reversed order
+    every other round); `prepare` (or None) runs untimed before each round
+    of a case. Returns {label: [Run of the round, ...]}."""
     times = {label: [] for label in cases}
     for i in range(runs):
         order = list(cases.items())
@@ -153,7 +165,7 @@ def time_interleaved(cases, runs):
         for label, (env, argvs, prepare) in order:
             if prepare:
                 prepare()
-            times[label].append(sum(wall(argv, env) for argv in argvs))
+            times[label].append(sum((timed(argv, env) for argv in argvs), Run(0.0, 0.0)))
     return times
 
 
@@ -182,18 +194,27 @@ class Spread:
     high: float | None
 
     @classmethod
-    def of(cls, values):
-        """Wall times: the machine's load only ever adds time, so the
-        fastest run bounds the cost from below."""
-        return cls(statistics.median(values), min(values), max(values))
+    def of(cls, runs):
+        """Wall times, with the fastest and slowest run."""
+        walls = [r.wall for r in runs]
+        return cls(statistics.median(walls), min(walls), max(walls))
+
+    @classmethod
+    def limit(cls, runs):
+        """Wall times against a time limit: the low bound is the least
+        processor time of a run. A single-threaded run takes at least its
+        processor time, and the machine's load hardly moves that, while it
+        may slow even the fastest run's wall time."""
+        return cls(statistics.median(r.wall for r in runs), min(r.cpu for r in runs),
+                   max(r.wall for r in runs))
 
     @classmethod
     def ratio(cls, num, den):
-        """num/den of wall times run in rounds (num[i] and den[i] back to
-        back): the median of the rounds' ratios and the bounds that load
+        """num/den of runs in rounds (num[i] and den[i] back to back): the
+        median of the rounds' wall-time ratios and the bounds that load
         falling on either side at random crosses less than once in
         1/CHANCE times."""
-        r = sorted(a / b for a, b in zip(num, den))
+        r = sorted(a.wall / b.wall for a, b in zip(num, den))
         k = bound_rank(len(r))
         return cls(statistics.median(r), r[k - 1] if k else None, r[-k] if k else None)
 
