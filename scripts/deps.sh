@@ -1,9 +1,11 @@
 #!/usr/bin/env bash
 # Installs the Debian packages the project builds and tests with, when missing.
+# --bench: also the measuring tools of bench/run.py.
 set -euo pipefail
 packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev libsimdjson-dev
           libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev
           graphviz jq lintian)
+[ "${1:-}" != --bench ] || packages+=(valgrind strace time)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
