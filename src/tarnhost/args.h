@@ -20,7 +20,7 @@ struct UsageError : std::runtime_error {
 
 // What a word names, for completion: the words that can stand there come
 // from tarnhost itself (command words, operation names), from the shell
-// (files), or, for the host's objects, from the host (not offered yet).
+// (files), or, for the host's objects, from the host (complete.cc).
 enum class Kind {
   Text,       // free text or a new name: nothing to offer
   Number,     // decimal

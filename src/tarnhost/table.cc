@@ -297,6 +297,14 @@ const std::vector<Command>& Commands() {
        .help = "Prints what the word is (files or words), then the words that fit, one a line.",
        .run = Complete,
        .hidden = true},
+      {.words = {"__names"},
+       .syntax = {.arguments = {{"KIND"}, {"OWNER", Kind::Text, true}}, .raw = true},
+       .summary = "print the names of the host's objects of a kind, for the shell",
+       .help = "KIND names a kind of object (pnic, portgroup, switch, ...; an unknown one is "
+               "refused naming them all); OWNER, the port group of clients or the switch of "
+               "DVPorts. Prints nothing when the host is busy or missing.",
+       .run = Names,
+       .hidden = true},
   };
   return commands;
 }

@@ -331,6 +331,27 @@ still needs; a distributed switch goes from the cache too, with its DVPorts.
   0
   [1]
 
+Completion offers the host's names, read without waiting for its lock and
+without making a host: a busy or missing host offers none.
+
+  $ c() { tarnhost __complete "$@" | tail -n +2 | paste -sd' '; }
+  $ tarnhost pnic add pnic5 && tarnhost pnic add pnic6
+  $ c dvport del dvs0 ''; c client del Management ''; c dvs add d --uplinks pnic5,''; c fault add X --on p
+  10 11
+  vm1
+  pnic5,pnic6
+  ps0
+  $ o() { bash -c 'source "$0"; COMP_WORDS=(orvocfg-vswitch "$@"); COMP_CWORD=$#; _orvocfg_vswitch
+  >   echo "${COMPREPLY[*]}"' "$TESTDIR/../../completions/orvocfg-vswitch" "$@"; }
+  $ o -L ''; o --pg=''; o -d v; o -a ''
+  pnic0 pnic1 pnic2 pnic4 pnic5 pnic6
+  --pg=ALL --pg=Management
+  vswitch0
+  
+  $ flock host.db tarnhost __names switch; TARN_HOST_DB=$PWD/none.db o -d ''; [ -e none.db ] || echo none
+  
+  none
+
 States that only the library makes (ENS, events, loaded timeouts, DVPort
 uplinks; after a reboot, clients and DVPorts whose port group or switch was
 replaced) survive a dump too.

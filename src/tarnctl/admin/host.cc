@@ -46,6 +46,8 @@ std::vector<OperationInfo> LibraryOperations() {
 
 Host::Host() : state_(std::make_unique<State>(State{Api::Session::Acquire()})) {}
 
+Host::Host(std::unique_ptr<State> state) : state_(std::move(state)) {}
+
 Host::~Host() = default;
 
 const std::string& Host::Path() const {

@@ -86,6 +86,22 @@ enum class Listing {
 // pnics are joined by commas.
 using ListRow = std::vector<std::string>;
 
+// The host's objects whose names the completion offers.
+enum class ObjectKind {
+  kPnic,
+  kFreePnic,  // that no switch uses
+  kPortGroup,
+  kSwitch,  // standard or distributed
+  kSystemSwitch,
+  kDVSwitch,
+  kOpaqueSwitch,
+  kPortset,  // standard switch names and the portsets of the others
+  kObject,   // what a fault's --on names: switch, portset, port group or DVPort id
+  kDVPort,   // port ids: of the switch named by the owner, or of any
+  kClient,   // clients: of the port group named by the owner, or of any
+  kFault,    // armed faults' numbers
+};
+
 class Host {
  public:
   Host();   // opens the host (creating the default one if missing)
@@ -131,6 +147,10 @@ class Host {
 
   // The objects of a list, in the order they were made.
   std::vector<ListRow> List(Listing what);
+  // The names of `kind` (of `owner`, where the kind says so), read without
+  // waiting for the host's lock and without creating a host, so that it
+  // never blocks: none when the host is busy, missing or unreadable.
+  static std::vector<std::string> PeekNames(ObjectKind kind, const std::string& owner = "");
 
   // The whole host as readable text: its file, the running state, the
   // stored configuration, ENS state, timeouts, armed faults.
@@ -151,6 +171,9 @@ class Host {
   struct State;
 
  private:
+  explicit Host(std::unique_ptr<State> state);
+  std::vector<std::string> Names(ObjectKind kind, const std::string& owner);
+
   std::unique_ptr<State> state_;
 };
 

@@ -1,6 +1,7 @@
-// The host's objects as lists for scripts (tarnhost's NOUN list). Which
-// switch uses a pnic is the model's rule, the one that refuses a pnic to
-// another switch.
+// The host's objects as lists for scripts (tarnhost's NOUN list) and their
+// names for completion. Which switch uses a pnic is the model's rule, the
+// one that refuses a pnic to another switch.
+#include <set>
 #include <string>
 #include <vector>
 
@@ -121,6 +122,16 @@ std::vector<ListRow> Faults(Db& db) {
   return rows;
 }
 
+// Field `field` of the rows whose first field is `owner` (any, when empty).
+std::vector<std::string> Column(const std::vector<ListRow>& rows, size_t field,
+                                const std::string& owner = "") {
+  std::vector<std::string> values;
+  for (const auto& row : rows) {
+    if (owner.empty() || row[0] == owner) values.push_back(row[field]);
+  }
+  return values;
+}
+
 }  // namespace
 
 std::vector<ListRow> Host::List(Listing what) {
@@ -144,6 +155,76 @@ std::vector<ListRow> Host::List(Listing what) {
       return Faults(db);
   }
   return {};
+}
+
+std::vector<std::string> Host::Names(ObjectKind kind, const std::string& owner) {
+  Db& db = state_->db();
+  std::vector<std::string> names;
+  auto add = [&](const std::vector<std::string>& more) {
+    names.insert(names.end(), more.begin(), more.end());
+  };
+  const bool object = kind == ObjectKind::kObject;
+  switch (kind) {
+    case ObjectKind::kPnic:
+      add(Store::Pnics::Names(db));
+      break;
+    case ObjectKind::kFreePnic:
+      for (const auto& row : Pnics(db)) {
+        if (row[1].empty()) names.push_back(row[0]);
+      }
+      break;
+    case ObjectKind::kSystemSwitch:
+      add(Column(SystemSwitches(db), 0));
+      break;
+    case ObjectKind::kDVSwitch:
+      add(Column(DVSwitches(db), 0));
+      break;
+    case ObjectKind::kOpaqueSwitch:
+      add(Column(OpaqueSwitches(db), 0));
+      break;
+    case ObjectKind::kClient:
+      add(Column(Clients(db), 1, owner));
+      break;
+    case ObjectKind::kFault:
+      add(Column(Faults(db), 0));
+      break;
+    case ObjectKind::kDVPort:
+      add(Column(DVPorts(db), 1, owner));
+      break;
+    case ObjectKind::kPortGroup:
+      add(Store::PortGroups::Names(db, Layer::kRunning));
+      break;
+    case ObjectKind::kSwitch:
+    case ObjectKind::kPortset:
+    case ObjectKind::kObject: {
+      const auto dvs = DVSwitches(db), opaque = OpaqueSwitches(db);
+      // A standard switch is its own portset; the others have one each.
+      for (const auto& sw : Store::Standard::ListAll(db, Layer::kRunning)) names.push_back(sw.name);
+      if (kind != ObjectKind::kPortset) add(Column(dvs, 0));
+      if (kind != ObjectKind::kSwitch) {
+        add(Column(dvs, 1));
+        add(Column(opaque, 1));
+      }
+      if (object) {
+        add(Column(opaque, 0));
+        add(Store::PortGroups::Names(db, Layer::kRunning));
+        add(Column(DVPorts(db), 1));
+      }
+      break;
+    }
+  }
+  std::set<std::string> seen;
+  std::erase_if(names, [&](const std::string& name) { return !seen.insert(name).second; });
+  return names;
+}
+
+std::vector<std::string> Host::PeekNames(ObjectKind kind, const std::string& owner) {
+  try {
+    auto session = Api::Session::AcquireAt(Api::Session::DefaultLocation(), {0, false});
+    return Host(std::make_unique<State>(State{std::move(session)})).Names(kind, owner);
+  } catch (const HostCtl::Lib::HostCtlException&) {
+    return {};
+  }
 }
 
 }  // namespace TarnCtl::Admin
