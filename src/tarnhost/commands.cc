@@ -1,5 +1,7 @@
 #include "tarnhost/commands.h"
 
+#include <unistd.h>
+
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
@@ -35,6 +37,40 @@ auto OnHost(Body body) {
     return result;
   }
 }
+
+// The progress of a long load or dump on standard error when that is a
+// terminal: one line that overwrites itself, ended by a newline when the
+// object goes (before anything else is printed). A host done before its
+// first report shows nothing.
+class ProgressLine {
+ public:
+  explicit ProgressLine(const char* what) : what_(what) {}
+  ~ProgressLine() {
+    if (shown_) std::fputc('\n', stderr);
+  }
+  ProgressLine(const ProgressLine&) = delete;
+  ProgressLine& operator=(const ProgressLine&) = delete;
+
+  TarnCtl::Admin::Progress Report() {
+    if (!isatty(STDERR_FILENO)) return nullptr;
+    return [this](int64_t done, int64_t total) {
+      if (!shown_ && total > 0 && done >= total) return;
+      shown_ = true;
+      if (total > 0) {
+        std::fprintf(stderr, "\rtarnhost: %s %lld of %lld rows (%lld%%)", what_,
+                     static_cast<long long>(done), static_cast<long long>(total),
+                     static_cast<long long>(done * 100 / total));
+      } else {
+        std::fprintf(stderr, "\rtarnhost: %s %lld rows", what_, static_cast<long long>(done));
+      }
+      std::fflush(stderr);
+    };
+  }
+
+ private:
+  const char* what_;
+  bool shown_ = false;
+};
 
 // The whole file, or standard input for "-"; any failure names the file.
 std::string ReadFile(const std::string& path) {
@@ -87,12 +123,18 @@ int Show(const Args& args) {
 }
 
 int Dump(const Args&) {
-  return Print(OnHost([](Host& host) { return host.Dump(); }));
+  std::string text;
+  {
+    ProgressLine progress("dump");
+    text = OnHost([&](Host& host) { return host.Dump(progress.Report()); });
+  }
+  return Print(text);
 }
 
 int Load(const Args& args) {
   const std::string text = ReadFile(args.Positional(0));
-  return OnHost([&](Host& host) { host.Load(text); });
+  ProgressLine progress("load");
+  return OnHost([&](Host& host) { host.Load(text, progress.Report()); });
 }
 
 int Reboot(const Args&) {

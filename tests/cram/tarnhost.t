@@ -377,3 +377,14 @@ replaced) survive a dump too.
   
   Faults
     (none)
+
+Load and dump show their progress when standard error is a terminal: one
+line that overwrites itself, ended by a newline; nothing otherwise.
+
+  $ python3 -c 'import json; print(json.dumps({"format": "tarnhost-dump", "version": 1,
+  >   "tables": {"pnic": [{"name": f"p{i}"} for i in range(5000)]}}))' > big.json
+  $ tarnhost load big.json 2>&1 && script -qec 'tarnhost load big.json && tarnhost dump > /dev/null' /dev/null < /dev/null |
+  >   tr '\r' '\n' | grep .
+  tarnhost: load 4096 rows
+  tarnhost: dump 4096 of 5002 rows (81%)
+  tarnhost: dump 5002 of 5002 rows (100%)
