@@ -7,6 +7,7 @@
 
 #include "tarnctl/admin/host.h"
 #include "tarnctl/admin/state.h"
+#include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/trace.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/store/distributed.h"
@@ -136,6 +137,7 @@ std::vector<std::string> Column(const std::vector<ListRow>& rows, size_t field,
 
 std::vector<ListRow> Host::List(Listing what) {
   Db& db = state_->db();
+  Instrument::Scope scope(db, "List");  // reads whole tables, as Show does
   switch (what) {
     case Listing::kPnics:
       return Pnics(db);
@@ -159,6 +161,7 @@ std::vector<ListRow> Host::List(Listing what) {
 
 std::vector<std::string> Host::Names(ObjectKind kind, const std::string& owner) {
   Db& db = state_->db();
+  Instrument::Scope scope(db, "List");
   std::vector<std::string> names;
   auto add = [&](const std::vector<std::string>& more) {
     names.insert(names.end(), more.begin(), more.end());

@@ -193,6 +193,8 @@ TEST_F(AdminTest, RemovalUndoesSeeding) {
   host.AddFault({"SetVlanId", "pg2", {}, {}, 0, 1});
   host.AddFault({"GetName", {}, "a\tb", {}, 0, 1});
   EXPECT_EQ(host.List(Listing::kPnics)[4], (TarnCtl::Admin::ListRow{"pnic4", "opq0", ""}));
+  EXPECT_EQ(host.List(Listing::kClients),
+            (std::vector<TarnCtl::Admin::ListRow>{{"Management", "vm1"}}));
   host.RemoveFault(1);
   EXPECT_EQ(host.List(Listing::kFaults),
             (std::vector<TarnCtl::Admin::ListRow>{
