@@ -20,7 +20,7 @@ struct UsageError : std::runtime_error {
 
 // What a word names, for completion: the words that can stand there come
 // from tarnhost itself (command words, operation names), from the shell
-// (files), or, for the host's objects, from the host (not offered yet).
+// (files), or, for the host's objects, from the host (complete.cc).
 enum class Kind {
   Text,       // free text or a new name: nothing to offer
   Number,     // decimal
@@ -28,11 +28,17 @@ enum class Kind {
   Command,    // tarnhost's own command words
   Operation,  // a library operation that a fault can make fail
   Pnic,
-  PnicList,  // pnics separated by commas
+  PnicList,  // free pnics separated by commas
   PortGroup,
+  Client,  // a client of the port group named before it
+  Switch,  // a standard or distributed switch
+  SystemSwitch,
   DVSwitch,
+  DVPort,  // a DVPort id of the switch named before it
+  OpaqueSwitch,
   Portset,
   Object,  // any named object: switch, portset, port group, DVPort id
+  Fault,   // the number of an armed fault
 };
 
 struct OptionSpec {

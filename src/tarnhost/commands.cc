@@ -1,10 +1,13 @@
 #include "tarnhost/commands.h"
 
+#include <unistd.h>
+
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
 #include <optional>
 #include <string>
+#include <type_traits>
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
@@ -15,6 +18,59 @@ namespace TarnHost {
 namespace {
 
 using TarnCtl::Admin::Host;
+using TarnCtl::Admin::Listing;
+
+// Runs `body` on the host and commits what it did before the command
+// succeeds: a commit that fails is then this command's failure ("tarnhost:
+// ..." and status 1), not the session's end. Returns what `body` returns
+// (0 for nothing).
+template <typename Body>
+auto OnHost(Body body) {
+  Host host;
+  if constexpr (std::is_void_v<decltype(body(host))>) {
+    body(host);
+    host.Commit();
+    return 0;
+  } else {
+    auto result = body(host);
+    host.Commit();
+    return result;
+  }
+}
+
+// The progress of a long load or dump on standard error when that is a
+// terminal: one line that overwrites itself, ended by a newline when the
+// object goes (before anything else is printed). A host done before its
+// first report shows nothing.
+class ProgressLine {
+ public:
+  explicit ProgressLine(const char* what) : what_(what) {}
+  ~ProgressLine() {
+    if (shown_) std::fputc('\n', stderr);
+  }
+  ProgressLine(const ProgressLine&) = delete;
+  ProgressLine& operator=(const ProgressLine&) = delete;
+
+  TarnCtl::Admin::Progress Report() {
+    if (!isatty(STDERR_FILENO)) return nullptr;
+    return [this](int64_t done, int64_t total) {
+      if (!shown_ && total > 0 && done >= total) return;
+      shown_ = true;
+      if (total > 0) {
+        std::fprintf(stderr, "\rtarnhost: %s %lld of %lld rows (%lld%%)", what_,
+                     static_cast<long long>(done), static_cast<long long>(total),
+                     static_cast<long long>(done * 100 / total));
+      } else {
+        std::fprintf(stderr, "\rtarnhost: %s %lld rows", what_, static_cast<long long>(done));
+      }
+      std::fflush(stderr);
+    };
+  }
+
+ private:
+  const char* what_;
+  bool shown_ = false;
+};
 
 // The whole file, or standard input for "-"; any failure names the file.
 std::string ReadFile(const std::string& path) {
@@ -52,8 +108,7 @@ int Print(const std::string& text) {
 }
 
 int Init(const Args& args) {
-  Host().Init(args.Has("empty"));
-  return 0;
+  return OnHost([&](Host& host) { host.Init(args.Has("empty")); });
 }
 
 int Show(const Args& args) {
@@ -62,23 +117,28 @@ int Show(const Args& args) {
   std::optional<std::string> name;
   if (!args.Positionals().empty()) name = args.Positional(0);
   if (name && !json) throw UsageError("NAME is shown with --json only");
-  Host host;
-  return Print(json ? host.ShowJson(name) : dot ? host.ShowDot() : host.Show());
+  return Print(OnHost([&](Host& host) {
+    return json ? host.ShowJson(name) : dot ? host.ShowDot() : host.Show();
+  }));
 }
 
 int Dump(const Args&) {
-  return Print(Host().Dump());
+  std::string text;
+  {
+    ProgressLine progress("dump");
+    text = OnHost([&](Host& host) { return host.Dump(progress.Report()); });
+  }
+  return Print(text);
 }
 
 int Load(const Args& args) {
   const std::string text = ReadFile(args.Positional(0));
-  Host().Load(text);
-  return 0;
+  ProgressLine progress("load");
+  return OnHost([&](Host& host) { host.Load(text, progress.Report()); });
 }
 
 int Reboot(const Args&) {
-  Host().Reboot();
-  return 0;
+  return OnHost([](Host& host) { host.Reboot(); });
 }
 
 int Path(const Args&) {
@@ -86,20 +146,17 @@ int Path(const Args&) {
 }
 
 int AddPnic(const Args& args) {
-  Host().AddPnic(args.Positional(0));
-  return 0;
+  return OnHost([&](Host& host) { host.AddPnic(args.Positional(0)); });
 }
 
 int AddClient(const Args& args) {
-  Host().AddClient(args.Positional(0), args.Positional(1));
-  return 0;
+  return OnHost([&](Host& host) { host.AddClient(args.Positional(0), args.Positional(1)); });
 }
 
 int AddSystemSwitch(const Args& args) {
   int32_t ports = HostCtl::Network::Portset::DEF_NUM_PORTS;
   if (auto v = args.Value("ports")) ports = ParseInt32(*v, "--ports");
-  Host().AddSystemSwitch(args.Positional(0), ports);
-  return 0;
+  return OnHost([&](Host& host) { host.AddSystemSwitch(args.Positional(0), ports); });
 }
 
 int AddDVSwitch(const Args& args) {
@@ -110,8 +167,7 @@ int AddDVSwitch(const Args& args) {
   if (auto v = args.Value("ports")) seed.ports = ParseInt32(*v, "--ports");
   if (auto v = args.Value("mtu")) seed.mtu = ParseUint32(*v, "--mtu");
   if (auto v = args.Value("uplinks")) seed.uplinks = SplitNames(*v, "--uplinks");
-  Host().AddDVSwitch(seed);
-  return 0;
+  return OnHost([&](Host& host) { host.AddDVSwitch(seed); });
 }
 
 int AddDVPort(const Args& args) {
@@ -120,8 +176,7 @@ int AddDVPort(const Args& args) {
   seed.portId = args.Positional(1);
   seed.clients = args.Values("client");
   if (auto v = args.Value("connection-id")) seed.connectionId = ParseUint32(*v, "--connection-id");
-  Host().AddDVPort(seed);
-  return 0;
+  return OnHost([&](Host& host) { host.AddDVPort(seed); });
 }
 
 int AddOpaque(const Args& args) {
@@ -131,22 +186,21 @@ int AddOpaque(const Args& args) {
   if (auto v = args.Value("ports")) seed.ports = ParseInt32(*v, "--ports");
   if (auto v = args.Value("used")) seed.used = ParseInt32(*v, "--used");
   if (auto v = args.Value("uplinks")) seed.uplinks = SplitNames(*v, "--uplinks");
-  Host().AddOpaqueSwitch(seed);
-  return 0;
+  return OnHost([&](Host& host) { host.AddOpaqueSwitch(seed); });
 }
 
 int AddUplinkTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(2), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(3), "TIMEOUT");
-  Host().AddUplinkTimeout(args.Positional(0), args.Positional(1), lagId, timeout);
-  return 0;
+  return OnHost([&](Host& host) {
+    host.AddUplinkTimeout(args.Positional(0), args.Positional(1), lagId, timeout);
+  });
 }
 
 int AddLagTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(1), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(2), "TIMEOUT");
-  Host().AddLagTimeout(args.Positional(0), lagId, timeout);
-  return 0;
+  return OnHost([&](Host& host) { host.AddLagTimeout(args.Positional(0), lagId, timeout); });
 }
 
 int AddFault(const Args& args) {
@@ -157,13 +211,70 @@ int AddFault(const Args& args) {
   seed.detail = args.Value("detail");
   if (auto v = args.Value("skip")) seed.skip = ParseInt64(*v, "--skip");
   if (auto v = args.Value("times")) seed.times = ParseInt64(*v, "--times");
-  Host().AddFault(seed);
-  return 0;
+  return OnHost([&](Host& host) { host.AddFault(seed); });
 }
 
 int ClearFaults(const Args&) {
-  Host().ClearFaults();
-  return 0;
+  return OnHost([](Host& host) { host.ClearFaults(); });
+}
+
+int RemovePnic(const Args& args) {
+  return OnHost([&](Host& host) { host.RemovePnic(args.Positional(0)); });
+}
+
+int RemoveClient(const Args& args) {
+  return OnHost([&](Host& host) { host.RemoveClient(args.Positional(0), args.Positional(1)); });
+}
+
+int RemoveSystemSwitch(const Args& args) {
+  return OnHost([&](Host& host) { host.RemoveSystemSwitch(args.Positional(0)); });
+}
+
+int RemoveDVSwitch(const Args& args) {
+  return OnHost([&](Host& host) { host.RemoveDVSwitch(args.Positional(0)); });
+}
+
+int RemoveDVPort(const Args& args) {
+  return OnHost([&](Host& host) { host.RemoveDVPort(args.Positional(0), args.Positional(1)); });
+}
+
+int RemoveOpaque(const Args& args) {
+  return OnHost([&](Host& host) { host.RemoveOpaqueSwitch(args.Positional(0)); });
+}
+
+int RemoveUplinkTimeout(const Args& args) {
+  const uint32_t lagId = ParseUint32(args.Positional(2), "LAGID");
+  return OnHost(
+      [&](Host& host) { host.RemoveUplinkTimeout(args.Positional(0), args.Positional(1), lagId); });
+}
+
+int RemoveLagTimeout(const Args& args) {
+  const uint32_t lagId = ParseUint32(args.Positional(1), "LAGID");
+  return OnHost([&](Host& host) { host.RemoveLagTimeout(args.Positional(0), lagId); });
+}
+
+int RemoveFault(const Args& args) {
+  const int64_t number = ParseInt64(args.Positional(0), "NUMBER");
+  return OnHost([&](Host& host) { host.RemoveFault(number); });
+}
+
+int PrintList(Listing what, const Args& args) {
+  const auto rows = OnHost([&](Host& host) { return host.List(what); });
+  const std::string* only = args.Positionals().empty() ? nullptr : &args.Positional(0);
+  std::string text;
+  for (const auto& row : rows) {
+    if (!only || row[0] == *only) text += Join(row, "\t") + "\n";
+  }
+  return Print(text);
+}
+
+int ListOperations(const Args&) {
+  std::string text;
+  for (const auto& operation : TarnCtl::Admin::LibraryOperations()) {
+    text +=
+        Join({operation.name, operation.faultable ? "yes" : "no", operation.target}, "\t") + "\n";
+  }
+  return Print(text);
 }
 
 }  // namespace TarnHost

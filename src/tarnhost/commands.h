@@ -1,9 +1,10 @@
 // The bodies of tarnhost's commands: each runs one administration call on
-// its parsed arguments (see table.cc) and returns the exit status. Bad
-// usage throws UsageError; the host's refusals throw
-// HostCtl::Lib::HostCtlException.
+// its parsed arguments (see table.cc), commits it, and returns the exit
+// status. Bad usage throws UsageError; the host's refusals (and a failed
+// commit) throw HostCtl::Lib::HostCtlException.
 #pragma once
 
+#include "tarnctl/admin/host.h"
 #include "tarnhost/args.h"
 
 namespace TarnHost {
@@ -24,6 +25,24 @@ int AddUplinkTimeout(const Args& args);
 int AddLagTimeout(const Args& args);
 int AddFault(const Args& args);
 int ClearFaults(const Args& args);
+int RemovePnic(const Args& args);
+int RemoveClient(const Args& args);
+int RemoveSystemSwitch(const Args& args);
+int RemoveDVSwitch(const Args& args);
+int RemoveDVPort(const Args& args);
+int RemoveOpaque(const Args& args);
+int RemoveUplinkTimeout(const Args& args);
+int RemoveLagTimeout(const Args& args);
+int RemoveFault(const Args& args);
+int ListOperations(const Args& args);
+
+// Prints the rows of a list, a line each with its fields separated by tabs;
+// given an argument, only the rows whose first field it is.
+int PrintList(TarnCtl::Admin::Listing what, const Args& args);
+template <TarnCtl::Admin::Listing what>
+int List(const Args& args) {
+  return PrintList(what, args);
+}
 
 // Writes `text` to standard output and returns 0; a failed write throws.
 int Print(const std::string& text);

@@ -21,9 +21,32 @@ const std::vector<std::string>& FaultOperationNames() {
 
 namespace {
 
+using TarnCtl::Admin::ObjectKind;
+
+// The kinds of the host's objects: what completes them, and their word for
+// `tarnhost __names`.
+struct HostKind {
+  Kind kind;
+  ObjectKind objects;
+  const char* word;
+};
+constexpr HostKind kHostKinds[] = {
+    {Kind::Pnic, ObjectKind::kPnic, "pnic"},
+    {Kind::PnicList, ObjectKind::kFreePnic, "free-pnic"},
+    {Kind::PortGroup, ObjectKind::kPortGroup, "portgroup"},
+    {Kind::Client, ObjectKind::kClient, "client"},
+    {Kind::Switch, ObjectKind::kSwitch, "switch"},
+    {Kind::SystemSwitch, ObjectKind::kSystemSwitch, "system-switch"},
+    {Kind::DVSwitch, ObjectKind::kDVSwitch, "dvs"},
+    {Kind::DVPort, ObjectKind::kDVPort, "dvport"},
+    {Kind::OpaqueSwitch, ObjectKind::kOpaqueSwitch, "opaque"},
+    {Kind::Portset, ObjectKind::kPortset, "portset"},
+    {Kind::Object, ObjectKind::kObject, "object"},
+    {Kind::Fault, ObjectKind::kFault, "fault"},
+};
+
 // The words of `kind` that can stand where `given` (the arguments before)
-// leads; the host's own objects are not offered (yet): they would be
-// looked up here.
+// leads. Clients and DVPorts are those of the argument before them.
 Words Candidates(Kind kind, const Words& given) {
   switch (kind) {
     case Kind::Command:
@@ -31,6 +54,11 @@ Words Candidates(Kind kind, const Words& given) {
     case Kind::Operation:
       return FaultOperationNames();
     default:
+      for (const auto& host : kHostKinds) {
+        if (host.kind == kind) {
+          return TarnCtl::Admin::Host::PeekNames(host.objects, given.empty() ? "" : given.back());
+        }
+      }
       return {};
   }
 }
@@ -47,7 +75,39 @@ int Offer(const char* what, const Words& candidates, const std::string& current,
   return Print(text);
 }
 
+// Offers the words of `kind` for `current`, after `before` ("--opt=").
+// In a list of pnics, the last one is completed, and those listed already
+// are not offered again.
+int OfferValue(Kind kind, const Words& given, const std::string& current,
+               const std::string& before = "") {
+  Words candidates = Candidates(kind, given);
+  const auto comma = current.rfind(',');
+  if (kind != Kind::PnicList || comma == std::string::npos) {
+    return Offer("words", candidates, current, before);
+  }
+  const std::string listed = current.substr(0, comma + 1);
+  std::erase_if(candidates, [&](const std::string& pnic) {
+    return ("," + listed).find("," + pnic + ",") != std::string::npos;
+  });
+  return Offer("words", candidates, current.substr(comma + 1), before + listed);
+}
+
 }  // namespace
+
+int Names(const Args& args) {
+  if (args.Positionals().empty()) throw UsageError("missing KIND");
+  const std::string& word = args.Positional(0);
+  Words words;
+  for (const auto& host : kHostKinds) {
+    if (word == host.word) {
+      const Words names = TarnCtl::Admin::Host::PeekNames(
+          host.objects, args.Positionals().size() > 1 ? args.Positional(1) : "");
+      return Print(names.empty() ? "" : Join(names, "\n") + "\n");
+    }
+    words.push_back(host.word);
+  }
+  throw UsageError("unknown kind " + word + " (" + Join(words, ", ") + ")");
+}
 
 int Complete(const Args& args) {
   if (args.Positionals().empty()) return Offer("words", {}, "");
@@ -81,12 +141,12 @@ int Complete(const Args& args) {
       options.push_back(name);
     }
   }
-  if (pending) return Offer("words", Candidates(pending->kind, {}), current);
+  if (pending) return OfferValue(pending->kind, {}, current);
   if (!optionsEnded && current.compare(0, 2, "--") == 0 && current.find('=') != std::string::npos) {
     const std::string name = current.substr(0, current.find('='));
     const OptionSpec* o = syntax.Option(name.substr(2));
     if (!o || !o->TakesValue()) return Offer("words", {}, current);
-    return Offer("words", Candidates(o->kind, {}), current.substr(name.size() + 1), name + "=");
+    return OfferValue(o->kind, {}, current.substr(name.size() + 1), name + "=");
   }
   if (!optionsEnded && !current.empty() && current[0] == '-') {
     Words names;
@@ -103,7 +163,8 @@ int Complete(const Args& args) {
                              : !specs.empty() && specs.back().repeats ? &specs.back()
                                                                       : nullptr;
   if (spec && spec->kind == Kind::File) return Offer("files", {}, current);
-  return Offer("words", spec ? Candidates(spec->kind, given) : Words{}, current);
+  if (!spec) return Offer("words", {}, current);
+  return OfferValue(spec->kind, given, current);
 }
 
 }  // namespace TarnHost

@@ -18,4 +18,9 @@ const std::vector<std::string>& FaultOperationNames();
 // one a line.
 int Complete(const Args& args);
 
+// Prints the names of the host's objects of the kind named by the first
+// word (of the owner named by the second), one a line, without waiting for
+// the host or creating it: for the completion of other programs.
+int Names(const Args& args);
+
 }  // namespace TarnHost

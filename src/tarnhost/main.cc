@@ -1,8 +1,8 @@
 // tarnhost: administration of the simulated host (see docs/host.md). Its
 // commands are the rows of the command table (table.cc).
 //
-// Exit status: 0 success; 1 when the host refused (its message follows
-// "tarnhost: " on standard error); 2 for bad usage (the reason and the
+// Exit status: 0 success; 1 when the host refused (the reason with its
+// explanation follows "tarnhost: " on standard error); 2 for bad usage (the reason and the
 // command's usage lines on standard error; nothing is opened).
 #include <cstdio>
 #include <exception>
@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "hostctl/exception.h"
+#include "tarnctl/admin/host.h"
 #include "tarnhost/args.h"
 #include "tarnhost/commands.h"
 #include "tarnhost/help.h"
@@ -55,7 +56,7 @@ int main(int argc, char** argv) {
   } catch (const UsageError& e) {
     return UsageFailure(e.what(), {command});
   } catch (const HostCtl::Lib::HostCtlException& e) {
-    std::fprintf(stderr, "tarnhost: %s\n", e.GetMessage().c_str());
+    std::fprintf(stderr, "tarnhost: %s\n", TarnCtl::Admin::Reason(e).c_str());
     return 1;
   } catch (const std::exception& e) {
     std::fprintf(stderr, "tarnhost: %s\n", e.what());

@@ -9,6 +9,8 @@
 namespace TarnHost {
 namespace {
 
+using TarnCtl::Admin::Listing;
+
 // Options that several commands share.
 const OptionSpec kPorts{
     .name = "ports", .value = "N", .help = "number of ports (default 128)", .kind = Kind::Number};
@@ -18,6 +20,9 @@ const OptionSpec kUplinks{.name = "uplinks",
                           .value = "A,B,...",
                           .help = "uplinks: pnics that no switch uses",
                           .kind = Kind::PnicList};
+
+#define LIST_FORM \
+  " Fields are separated by a tab and lists within a field by commas; an empty field is none."
 
 #define TIMEOUT_RULES                                                                       \
   "The timeout is 0 to 255 and the portset 1 to 31 bytes; the portset need not exist yet, " \
@@ -85,18 +90,52 @@ const std::vector<Command>& Commands() {
        .summary = "add a physical NIC",
        .help = "Its name is 1 to 31 bytes and unique.",
        .run = AddPnic},
+      {.words = {"pnic", "del"},
+       .syntax = {.arguments = {{"NAME", Kind::Pnic}}},
+       .summary = "remove a physical NIC",
+       .help = "Refused while a switch of the running state uses it, and while the stored "
+               "configuration or the distributed switch cache links it: a restore would link it "
+               "again.",
+       .run = RemovePnic},
+      {.words = {"pnic", "list"},
+       .summary = "list the physical NICs",
+       .help = "A line for each: its name, the running switch that uses it, and the switch that "
+               "links it in the stored configuration or the cache." LIST_FORM,
+       .run = List<Listing::kPnics>},
       {.words = {"client", "add"},
        .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup}, {"CLIENT"}}},
        .summary = "connect a client to a port group",
        .help = "The port group is one of the running state; the client takes one port of its "
                "switch. Client names are 1 to 127 bytes, unique on their port group.",
        .run = AddClient},
+      {.words = {"client", "del"},
+       .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup}, {"CLIENT", Kind::Client}}},
+       .summary = "disconnect a client from a port group",
+       .help = "The port group need not exist: a client waits for a port group of its name.",
+       .run = RemoveClient},
+      {.words = {"client", "list"},
+       .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup, true}}},
+       .summary = "list the clients of port groups",
+       .help = "A line for each: its port group and its name; those of PORTGROUP only when "
+               "given." LIST_FORM,
+       .run = List<Listing::kClients>},
       {.words = {"system-switch", "add"},
        .syntax = {.arguments = {{"NAME"}}, .options = {kPorts}},
        .summary = "add a system switch",
        .help = "It has MTU 1500, CDP listen and an empty uplink order, in both layers; "
                "orvocfg-vswitch lists it with -l -S only.",
        .run = AddSystemSwitch},
+      {.words = {"system-switch", "del"},
+       .syntax = {.arguments = {{"NAME", Kind::SystemSwitch}}},
+       .summary = "remove a system switch",
+       .help = "From both layers, with its port groups and links; refused while its port groups "
+               "have clients, as the library refuses a standard switch.",
+       .run = RemoveSystemSwitch},
+      {.words = {"system-switch", "list"},
+       .summary = "list the system switches",
+       .help = "A line for each of the running state: its name, ports, used ports and "
+               "uplinks." LIST_FORM,
+       .run = List<Listing::kSystemSwitches>},
       {.words = {"dvs", "add"},
        .syntax = {.arguments = {{"NAME"}},
                   .options = {kPortset,
@@ -111,6 +150,17 @@ const std::vector<Command>& Commands() {
        .help = "Adds it to the running state and the distributed switch cache. Its names and "
                "switch id must not be used by any switch.",
        .run = AddDVSwitch},
+      {.words = {"dvs", "del"},
+       .syntax = {.arguments = {{"NAME", Kind::DVSwitch}}},
+       .summary = "remove a distributed switch",
+       .help = "From the running state and the cache, with its uplinks and DVPorts; refused "
+               "while a DVPort has a client, as the library refuses it.",
+       .run = RemoveDVSwitch},
+      {.words = {"dvs", "list"},
+       .summary = "list the distributed switches",
+       .help = "A line for each of the running state: its name, portset, switch id, ports, used "
+               "ports and uplinks." LIST_FORM,
+       .run = List<Listing::kDVSwitches>},
       {.words = {"dvport", "add"},
        .syntax = {.arguments = {{"DVS", Kind::DVSwitch}, {"PORTID"}},
                   .options = {{.name = "client",
@@ -124,6 +174,17 @@ const std::vector<Command>& Commands() {
        .summary = "add a DVPort to a distributed switch",
        .help = "A switch holds at most its number of ports of DVPorts.",
        .run = AddDVPort},
+      {.words = {"dvport", "del"},
+       .syntax = {.arguments = {{"DVS", Kind::DVSwitch}, {"PORTID", Kind::DVPort}}},
+       .summary = "remove a DVPort",
+       .help = "Refused while it has clients or holds an uplink.",
+       .run = RemoveDVPort},
+      {.words = {"dvport", "list"},
+       .syntax = {.arguments = {{"DVS", Kind::DVSwitch, true}}},
+       .summary = "list the DVPorts",
+       .help = "A line for each: its switch, port id, connection id, the uplinks added to it, "
+               "then a field for each client; those of DVS only when given." LIST_FORM,
+       .run = List<Listing::kDVPorts>},
       {.words = {"opaque", "add"},
        .syntax = {.arguments = {{"NAME"}},
                   .options = {kPortset,
@@ -136,6 +197,15 @@ const std::vector<Command>& Commands() {
        .summary = "add an opaque switch",
        .help = "orvocfg-vswitch lists it but cannot change it.",
        .run = AddOpaque},
+      {.words = {"opaque", "del"},
+       .syntax = {.arguments = {{"NAME", Kind::OpaqueSwitch}}},
+       .summary = "remove an opaque switch",
+       .help = "Its control plane may; orvocfg-vswitch cannot.",
+       .run = RemoveOpaque},
+      {.words = {"opaque", "list"},
+       .summary = "list the opaque switches",
+       .help = "A line for each: its name, portset, ports, used ports and uplinks." LIST_FORM,
+       .run = List<Listing::kOpaqueSwitches>},
       {.words = {"timeout", "add", "uplink"},
        .also = {{"timeout", "uplink"}},
        .syntax = {.arguments = {{"PORTSET", Kind::Portset},
@@ -153,6 +223,23 @@ const std::vector<Command>& Commands() {
        .summary = "store a LAG timeout record",
        .help = "orvocfg-vswitch -G loads the matching records. " TIMEOUT_RULES,
        .run = AddLagTimeout},
+      {.words = {"timeout", "del", "uplink"},
+       .syntax = {.arguments = {{"PORTSET", Kind::Portset},
+                                {"UPLINK", Kind::Pnic},
+                                {"LAGID", Kind::Number}}},
+       .summary = "remove a stored uplink timeout record",
+       .help = "Records loaded into the running state stay until the next load.",
+       .run = RemoveUplinkTimeout},
+      {.words = {"timeout", "del", "lag"},
+       .syntax = {.arguments = {{"PORTSET", Kind::Portset}, {"LAGID", Kind::Number}}},
+       .summary = "remove a stored LAG timeout record",
+       .help = "Records loaded into the running state stay until the next load.",
+       .run = RemoveLagTimeout},
+      {.words = {"timeout", "list"},
+       .summary = "list the stored timeout records",
+       .help = "A line for each, uplink records first: uplink or lag, its portset, uplink (empty "
+               "for a LAG record), LAG id and timeout." LIST_FORM,
+       .run = List<Listing::kTimeouts>},
       {.words = {"fault", "add"},
        .syntax = {.arguments = {{"OPERATION", Kind::Operation}},
                   .options = {{.name = "on",
@@ -178,9 +265,25 @@ const std::vector<Command>& Commands() {
        .help = "OPERATION is named as in the host control interface (SetVlanId, AddUplink, ...); "
                "its next matching calls throw. NODI_CheckSig fails by returning a non-zero "
                "status and GetIntParamList by returning no list. Faults are used up across "
-               "runs; 'tarnhost show' lists those still armed.",
+               "runs; 'tarnhost fault list' lists those still armed.",
        .run = AddFault},
+      {.words = {"fault", "del"},
+       .syntax = {.arguments = {{"NUMBER", Kind::Fault}}},
+       .summary = "remove an armed fault",
+       .help = "NUMBER is the one 'tarnhost fault list' shows; a fault keeps it while armed.",
+       .run = RemoveFault},
+      {.words = {"fault", "list"},
+       .summary = "list the armed faults",
+       .help = "A line for each, in the order they are tried: its number, operation, the object "
+               "of --on, the calls still to let pass and to fail, the message and the detailed "
+               "message (quoted and escaped as in the call trace)." LIST_FORM,
+       .run = List<Listing::kFaults>},
       {.words = {"fault", "clear"}, .summary = "remove every armed fault", .run = ClearFaults},
+      {.words = {"fault", "ops"},
+       .summary = "list the library's operations",
+       .help = "A line for each, by name: its name, yes when a fault can make it fail (no: it "
+               "runs without the host), and what --on names for it." LIST_FORM,
+       .run = ListOperations},
       {.words = {"help"},
        .also = {{"-h"}, {"--help"}},
        .syntax = {.arguments = {{"COMMAND", Kind::Command, true, true}}},
@@ -193,6 +296,14 @@ const std::vector<Command>& Commands() {
        .summary = "complete the last WORD of a command line, for the shell",
        .help = "Prints what the word is (files or words), then the words that fit, one a line.",
        .run = Complete,
+       .hidden = true},
+      {.words = {"__names"},
+       .syntax = {.arguments = {{"KIND"}, {"OWNER", Kind::Text, true}}, .raw = true},
+       .summary = "print the names of the host's objects of a kind, for the shell",
+       .help = "KIND names a kind of object (pnic, portgroup, switch, ...; an unknown one is "
+               "refused naming them all); OWNER, the port group of clients or the switch of "
+               "DVPorts. Prints nothing when the host is busy or missing.",
+       .run = Names,
        .hidden = true},
   };
   return commands;

@@ -13,7 +13,7 @@ standard output with status 0; without a command it is bad usage.
   $ tarnhost -h | cmp - help && tarnhost --help | cmp - help
   $ tarnhost 2>&1 >/dev/null | tail -n +2 | cmp - help; tarnhost 2>&1 | head -1
   tarnhost: no command given
-  $ cat help
+  $ sed -n '1,12p;/system-switch add/,+1p;/^  help/,$p' help
   usage: tarnhost COMMAND [ARGUMENTS]
   Administers the simulated host: the host file named by TARN_HOST_DB, or the
   default location; see 'tarnhost path'.
@@ -25,22 +25,9 @@ standard output with status 0; without a command it is bad usage.
     reboot                        drop the running state, keep the stored configuration
     path                          print the path of the host file
     pnic add NAME                 add a physical NIC
-    client add PORTGROUP CLIENT   connect a client to a port group
+    pnic del NAME                 remove a physical NIC
     system-switch add NAME [--ports N]
                                   add a system switch
-    dvs add NAME [--portset NAME] [--id ID] [--ports N] [--mtu N] [--uplinks A,B,...]
-                                  add a distributed switch
-    dvport add DVS PORTID [--client NAME]... [--connection-id N]
-                                  add a DVPort to a distributed switch
-    opaque add NAME [--portset NAME] [--ports N] [--used N] [--uplinks A,B,...]
-                                  add an opaque switch
-    timeout add uplink PORTSET UPLINK LAGID TIMEOUT
-                                  store an uplink timeout record
-    timeout add lag PORTSET LAGID TIMEOUT
-                                  store a LAG timeout record
-    fault add OPERATION [--on NAME] [--message TEXT] [--detail TEXT] [--skip K] [--times N]
-                                  make a library operation fail
-    fault clear                   remove every armed fault
     help [COMMAND...]             print this text, or the help of COMMAND
     --version                     print tarnhost's version
   
@@ -53,28 +40,29 @@ Help at every level: that of the commands that begin with the words given,
 also with -h or --help after them (which wins over mistakes, but not over
 "--" or an option's value).
 
-  $ tarnhost help fault
-  usage: tarnhost fault add OPERATION [--on NAME] [--message TEXT] [--detail TEXT] [--skip K] [--times N]
-         tarnhost fault clear
+  $ tarnhost help pnic
+  usage: tarnhost pnic add NAME
+         tarnhost pnic del NAME
+         tarnhost pnic list
   
-  fault add: make a library operation fail
-    OPERATION is named as in the host control interface (SetVlanId, AddUplink,
-    ...); its next matching calls throw. NODI_CheckSig fails by returning a
-    non-zero status and GetIntParamList by returning no list. Faults are used up
-    across runs; 'tarnhost show' lists those still armed.
-    --on NAME       only calls on the object of that name, or given that name
-    --message TEXT  the exception's message (default: injected fault)
-    --detail TEXT   its detailed message (default: injected fault in OPERATION)
-    --skip K        let K matching calls pass first (default 0)
-    --times N       fail N calls (default 1)
+  pnic add: add a physical NIC
+    Its name is 1 to 31 bytes and unique.
   
-  fault clear: remove every armed fault
+  pnic del: remove a physical NIC
+    Refused while a switch of the running state uses it, and while the stored
+    configuration or the distributed switch cache links it: a restore would link
+    it again.
+  
+  pnic list: list the physical NICs
+    A line for each: its name, the running switch that uses it, and the switch
+    that links it in the stored configuration or the cache. Fields are separated
+    by a tab and lists within a field by commas; an empty field is none.
   $ tarnhost fault --help | cmp - <(tarnhost help fault) && tarnhost -h timeout uplink | tail -1
     Also spelled: timeout uplink.
   $ for args in 'pnic -h' 'show -h' 'dvs add --help' 'init --full -h' 'timeout add -h' \
   >     'timeout lag 1 -h' 'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
   >   brief $args | cut -d'|' -f1-2; done
-  0 usage: tarnhost pnic add ...|pnic add: add a physical NIC
+  0 usage: tarnhost pnic add ...|       tarnhost pnic del ...
   0 usage: tarnhost show ...|show: print the host in readable form, as JSON or as a graph
   0 usage: tarnhost dvs add ...|dvs add: add a distributed switch
   0 usage: tarnhost init ...|init: reset the host to the default host, or to an empty one
@@ -119,10 +107,10 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: unknown command: bogus|see 'tarnhost help'
   2 tarnhost: unknown command: dumo; did you mean dump?|see 'tarnhost help'
   2 tarnhost: unknown option --verison; did you mean --version?|see 'tarnhost help'
-  2 tarnhost: missing verb after pnic (add)|usage: tarnhost pnic add ...
+  2 tarnhost: missing verb after pnic (add, del, list)|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
   2 tarnhost: missing word after timeout add (uplink, lag)|usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
-  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...
-  2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault clear
+  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
+  2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault del ...|       tarnhost fault list|       tarnhost fault clear|       tarnhost fault ops
   2 tarnhost: missing NAME|usage: tarnhost pnic add ...
   2 tarnhost: missing CLIENT|usage: tarnhost client add ...
   2 tarnhost: unexpected argument b|usage: tarnhost pnic add ...
@@ -136,7 +124,7 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: empty name in --uplinks|usage: tarnhost dvs add ...
   2 tarnhost: option --mtu needs a value|usage: tarnhost dvs add ...
   2 tarnhost: bad number for --skip: " 1"|usage: tarnhost fault add ...
-  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...
+  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
   2 tarnhost: NAME is shown with --json only|usage: tarnhost show ...
   2 tarnhost: --json and --dot exclude each other|usage: tarnhost show ...
   $ ls
@@ -146,7 +134,7 @@ The completion (asking tarnhost) offers exactly, and the man page lists
 exactly, the commands and options of the table as the usage shows it.
 
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
-  18 commands, 20 options compared
+  36 commands, 20 options compared
 
 The default host as a dump.
 
@@ -154,7 +142,8 @@ The default host as a dump.
   created a new default host at */host.db (glob)
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
 
-Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
+Refusals of the host: "tarnhost: " and the reason with its explanation,
+status 1, nothing changed.
 
   $ tarnhost dump > before.json
   $ while read -r args; do eval "set -- $args"; refused tarnhost "$@" < /dev/null; done <<'EOF' | paste -d' ' - -
@@ -172,21 +161,39 @@ Refusals of the host: "tarnhost: " and the reason, status 1, nothing changed.
   > fault add GetName --times 0
   > fault add ''
   > show --json nosuch
+  > pnic del pnic0
+  > pnic del pnic9
+  > client del Management vm9
+  > system-switch del vswitch0
+  > dvs del d9
+  > dvport del d9 1
+  > opaque del o9
+  > timeout del lag vs0 1
+  > fault del 1
   > EOF
   status 1 tarnhost: Pnic pnic0 already exists
   status 1 tarnhost: Portgroup nosuch does not exist
-  status 1 tarnhost: Virtual switch vswitch0 already exists
-  status 1 tarnhost: Invalid number of ports 4097
+  status 1 tarnhost: Virtual switch vswitch0 already exists on this host
+  status 1 tarnhost: Invalid number of ports 4097 (8-4096)
   status 1 tarnhost: pnic0 is already linked to vswitch0
-  status 1 tarnhost: Uplink pnic9 does not exist
-  status 1 tarnhost: MTU 1279 is out of range
-  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long
+  status 1 tarnhost: Uplink pnic9 does not exist on this host
+  status 1 tarnhost: MTU 1279 is out of range (1280-9000)
+  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
   status 1 tarnhost: DVS nosuch does not exist
-  status 1 tarnhost: Invalid number of used ports 17
-  status 1 tarnhost: Invalid timeout 256
-  status 1 tarnhost: Invalid times 0
+  status 1 tarnhost: Invalid number of used ports 17 (0-16)
+  status 1 tarnhost: Invalid timeout 256 (0-255)
+  status 1 tarnhost: Invalid times 0 (it must be 1 or more)
   status 1 tarnhost: Fault operation is empty
-  status 1 tarnhost: No standard switch, distributed switch or port group is named nosuch
+  status 1 tarnhost: No standard switch, distributed switch or port group is named nosuch in either layer
+  status 1 tarnhost: Pnic pnic0 is linked to vswitch0
+  status 1 tarnhost: Pnic pnic9 does not exist
+  status 1 tarnhost: Client vm9 is not on portgroup Management
+  status 1 tarnhost: Virtual switch vswitch0 is not a system switch (orvocfg-vswitch -d removes it)
+  status 1 tarnhost: DVS d9 does not exist
+  status 1 tarnhost: DVPort 1 does not exist on d9
+  status 1 tarnhost: Opaque switch o9 does not exist
+  status 1 tarnhost: No LAG timeout for vs0, LAG 1 is stored
+  status 1 tarnhost: Fault 1 does not exist (tarnhost fault list numbers the armed ones)
   $ tarnhost dump | cmp - before.json
 
 Seeding shows up, and a dump brings it all back.
@@ -201,7 +208,7 @@ Seeding shows up, and a dump brings it all back.
   $ tarnhost timeout add lag ps0 2 255
   $ tarnhost fault add SetVlanId --on pg2 --skip 1 --message boom
   $ tarnhost fault add -- -odd
-  tarnhost: Unknown operation -odd
+  tarnhost: Unknown operation -odd (tarnhost fault ops lists them)
   [1]
   $ tarnhost show | sed -n "s|$PWD|PWD|;1,2p;/^Stored/,\$p"
   Host: PWD/host.db
@@ -234,6 +241,24 @@ Seeding shows up, and a dump brings it all back.
   
   Faults
     SetVlanId on pg2: lets 1 pass, then fails 1; message "boom", detail "injected fault in SetVlanId"
+  $ for noun in pnic client system-switch dvs dvport opaque timeout fault; do
+  >   tarnhost $noun list; done | tr '\t' '|'
+  pnic0|vswitch0|vswitch0
+  pnic1|dvs0|dvs0
+  pnic2|dvs0|dvs0
+  pnic3|opq0|
+  pnic4||
+  Management|vm1
+  sys0|64|0|
+  dvs0|ps0|dvs-dvs0|128|3|pnic1,pnic2
+  dvs0|10|7||vmA|vmB
+  opq0|opq0|128|3|pnic3
+  uplink|vswitch0|pnic0|1|5
+  lag|ps0||2|255
+  1|SetVlanId|pg2|1|1|"boom"|"injected fault in SetVlanId"
+  $ tarnhost fault ops | grep -E '^(SetVlanId|TARN_ReturnStatusToString)\s' | tr '\t' '|'
+  SetVlanId|yes|a port group
+  TARN_ReturnStatusToString|no|nothing (any call)
   $ tarnhost dump > seeded.json
   $ tarnhost fault clear
   $ tarnhost reboot
@@ -246,6 +271,9 @@ Seeding shows up, and a dump brings it all back.
     LAG timeouts: (none)
   
   Stored configuration
+  $ refused tarnhost pnic del pnic1
+  status 1
+  tarnhost: Pnic pnic1 is linked to dvs0 in the stored configuration (a restore would link it again)
   $ tarnhost load - < seeded.json
   $ tarnhost dump | cmp - seeded.json
 
@@ -267,6 +295,62 @@ A faulty dump or file is refused and the host stays as it was.
   status 1
   tarnhost: cannot read standard input: Is a directory
   $ tarnhost dump | cmp - seeded.json
+
+Removal refuses, in the library's words, what a switch, a link or a client
+still needs; a distributed switch goes from the cache too, with its DVPorts.
+
+  $ orvocfg-vswitch -A pgS sys0 && tarnhost client add pgS vmS
+  $ tarnhost dvport add dvs0 11 --connection-id 5 && orvocfg-vswitch -P pnic4 -V 11 dvs0
+  $ while read -r args; do refused tarnhost $args; done <<'EOF' | paste -d' ' - -
+  > system-switch del sys0
+  > dvs del dvs0
+  > dvport del dvs0 10
+  > dvport del dvs0 11
+  > pnic del pnic3
+  > EOF
+  status 1 tarnhost: Virtual switch sys0 has 1 ports in use
+  status 1 tarnhost: DVS dvs0 has 1 ports in use
+  status 1 tarnhost: DVPort 10 on dvs0 is in use (clients: 2)
+  status 1 tarnhost: DVPort 11 on dvs0 holds uplink pnic4
+  status 1 tarnhost: Pnic pnic3 is linked to opq0
+  $ tarnhost client del pgS vmS && tarnhost system-switch del sys0 && tarnhost opaque del opq0 &&
+  > tarnhost pnic del pnic3 && tarnhost fault del 1 && tarnhost timeout del lag ps0 2
+  $ tarnhost dvs add dvs1 && tarnhost dvport add dvs1 1 && tarnhost dvs del dvs1
+  $ for noun in pnic client system-switch dvs dvport opaque timeout fault; do
+  >   tarnhost $noun list; done | tr '\t' '|'
+  pnic0|vswitch0|vswitch0
+  pnic1|dvs0|dvs0
+  pnic2|dvs0|dvs0
+  pnic4|dvs0|dvs0
+  Management|vm1
+  dvs0|ps0|dvs-dvs0|128|4|pnic1,pnic2,pnic4
+  dvs0|10|7||vmA|vmB
+  dvs0|11|5|pnic4
+  uplink|vswitch0|pnic0|1|5
+  $ tarnhost show | grep -c dvs1
+  0
+  [1]
+
+Completion offers the host's names, read without waiting for its lock and
+without making a host: a busy or missing host offers none.
+
+  $ c() { tarnhost __complete "$@" | tail -n +2 | paste -sd' '; }
+  $ tarnhost pnic add pnic5 && tarnhost pnic add pnic6
+  $ c dvport del dvs0 ''; c client del Management ''; c dvs add d --uplinks pnic5,''; c fault add X --on p
+  10 11
+  vm1
+  pnic5,pnic6
+  ps0
+  $ o() { bash -c 'source "$0"; COMP_WORDS=(orvocfg-vswitch "$@"); COMP_CWORD=$#; _orvocfg_vswitch
+  >   echo "${COMPREPLY[*]}"' "$TESTDIR/../../completions/orvocfg-vswitch" "$@"; }
+  $ o -L ''; o --pg=''; o -d v; o -a ''
+  pnic0 pnic1 pnic2 pnic4 pnic5 pnic6
+  --pg=ALL --pg=Management
+  vswitch0
+  
+  $ flock host.db tarnhost __names switch; TARN_HOST_DB=$PWD/none.db o -d ''; [ -e none.db ] || echo none
+  
+  none
 
 States that only the library makes (ENS, events, loaded timeouts, DVPort
 uplinks; after a reboot, clients and DVPorts whose port group or switch was
@@ -293,3 +377,14 @@ replaced) survive a dump too.
   
   Faults
     (none)
+
+Load and dump show their progress when standard error is a terminal: one
+line that overwrites itself, ended by a newline; nothing otherwise.
+
+  $ python3 -c 'import json; print(json.dumps({"format": "tarnhost-dump", "version": 1,
+  >   "tables": {"pnic": [{"name": f"p{i}"} for i in range(5000)]}}))' > big.json
+  $ tarnhost load big.json 2>&1 && script -qec 'tarnhost load big.json && tarnhost dump > /dev/null' /dev/null < /dev/null |
+  >   tr '\r' '\n' | grep .
+  tarnhost: load 4096 rows
+  tarnhost: dump 4096 of 5002 rows (81%)
+  tarnhost: dump 5002 of 5002 rows (100%)

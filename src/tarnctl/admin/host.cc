@@ -19,6 +19,18 @@ using Instrument::Refused;
 using Instrument::Scope;
 using Store::Transaction;
 
+std::string Reason(const HostCtl::Lib::HostCtlException& refusal) {
+  // Refused() writes "<operation>: <message>[ <where>]"; other failures
+  // (the host file's, a dump's) carry their whole text in both.
+  const std::string& message = refusal.GetMessage();
+  const std::string detail = refusal.GetDetailedMessage();
+  const auto colon = detail.find(": ");
+  if (colon != std::string::npos && detail.compare(colon + 2, message.size(), message) == 0) {
+    return detail.substr(colon + 2);
+  }
+  return detail.empty() ? message : detail;
+}
+
 std::string HostPath() {
   return Api::Session::DefaultLocation().path;
 }
@@ -33,6 +45,8 @@ std::vector<OperationInfo> LibraryOperations() {
 }
 
 Host::Host() : state_(std::make_unique<State>(State{Api::Session::Acquire()})) {}
+
+Host::Host(std::unique_ptr<State> state) : state_(std::move(state)) {}
 
 Host::~Host() = default;
 
@@ -81,6 +95,17 @@ void Host::AddFault(const FaultSeed& seed) {
   Store::Faults::Insert(
       db, {0, seed.operation, seed.on, seed.message.value_or("injected fault"),
            seed.detail.value_or("injected fault in " + seed.operation), seed.skip, seed.times});
+  transaction.Commit();
+}
+
+void Host::RemoveFault(int64_t number) {
+  Store::Db& db = state_->db();
+  Scope scope(db, "RemoveFault");
+  Transaction transaction(db);
+  if (!Store::Faults::Delete(db, number)) {
+    throw Refused("Fault " + std::to_string(number) + " does not exist",
+                  "(tarnhost fault list numbers the armed ones)");
+  }
   transaction.Commit();
 }
 

@@ -13,6 +13,8 @@
 #include <string>
 #include <vector>
 
+#include "hostctl/exception.h"
+
 namespace TarnCtl::Admin {
 
 struct DVSwitchSeed {
@@ -48,6 +50,11 @@ struct FaultSeed {
   int64_t times = 1;
 };
 
+// A refusal as people read it: its reason with the explanation, that is
+// the detailed message without the operation's name in front ("Invalid
+// number of ports 4097 (8-4096)"); the message when there is no more.
+std::string Reason(const HostCtl::Lib::HostCtlException& refusal);
+
 // The host file that Host() opens, as the environment names it; refuses a
 // mistaken name (TARN_HOST_DB starting with "~").
 std::string HostPath();
@@ -63,6 +70,37 @@ std::vector<OperationInfo> LibraryOperations();
 
 // Reports progress of a long operation: rows done so far of `total`.
 using Progress = std::function<void(int64_t done, int64_t total)>;
+
+// What the host's lists hold (`tarnhost NOUN list`), one kind of object each.
+enum class Listing {
+  kPnics,           // name, running switch that uses it, stored switch that links it
+  kClients,         // port group, client
+  kSystemSwitches,  // name, ports, used ports, uplinks
+  kDVSwitches,      // name, portset, switch id, ports, used ports, uplinks
+  kOpaqueSwitches,  // name, portset, ports, used ports, uplinks
+  kDVPorts,         // switch, port id, connection id, uplinks, then a field per client
+  kTimeouts,        // "uplink" or "lag", portset, uplink, LAG id, timeout (stored records)
+  kFaults,          // number, operation, object, skip, times, message, detail (quoted)
+};
+// A row of text fields per object; an empty field is none, and lists of
+// pnics are joined by commas.
+using ListRow = std::vector<std::string>;
+
+// The host's objects whose names the completion offers.
+enum class ObjectKind {
+  kPnic,
+  kFreePnic,  // that no switch uses
+  kPortGroup,
+  kSwitch,  // standard or distributed
+  kSystemSwitch,
+  kDVSwitch,
+  kOpaqueSwitch,
+  kPortset,  // standard switch names and the portsets of the others
+  kObject,   // what a fault's --on names: switch, portset, port group or DVPort id
+  kDVPort,   // port ids: of the switch named by the owner, or of any
+  kClient,   // clients: of the port group named by the owner, or of any
+  kFault,    // armed faults' numbers
+};
 
 class Host {
  public:
@@ -93,6 +131,27 @@ class Host {
   void AddFault(const FaultSeed& seed);
   void ClearFaults();
 
+  // Removal refuses what the library would refuse (an object in use or that
+  // something still names) and unknown objects.
+  void RemovePnic(const std::string& name);
+  void RemoveClient(const std::string& portGroup, const std::string& client);
+  void RemoveSystemSwitch(const std::string& name);
+  // From the running state and the cache, with its DVPorts.
+  void RemoveDVSwitch(const std::string& name);
+  void RemoveDVPort(const std::string& dvs, const std::string& portId);
+  void RemoveOpaqueSwitch(const std::string& name);
+  void RemoveUplinkTimeout(const std::string& portset, const std::string& uplink, uint32_t lagId);
+  void RemoveLagTimeout(const std::string& portset, uint32_t lagId);
+  // The fault of that number, as List(kFaults) shows it.
+  void RemoveFault(int64_t number);
+
+  // The objects of a list, in the order they were made.
+  std::vector<ListRow> List(Listing what);
+  // The names of `kind` (of `owner`, where the kind says so), read without
+  // waiting for the host's lock and without creating a host, so that it
+  // never blocks: none when the host is busy, missing or unreadable.
+  static std::vector<std::string> PeekNames(ObjectKind kind, const std::string& owner = "");
+
   // The whole host as readable text: its file, the running state, the
   // stored configuration, ENS state, timeouts, armed faults.
   std::string Show();
@@ -112,6 +171,9 @@ class Host {
   struct State;
 
  private:
+  explicit Host(std::unique_ptr<State> state);
+  std::vector<std::string> Names(ObjectKind kind, const std::string& owner);
+
   std::unique_ptr<State> state_;
 };
 

@@ -1,7 +1,7 @@
 // Seeding the host with what the tool cannot create itself: pnics, clients,
 // system switches, distributed switches (as their management plane would),
-// DVPorts, opaque switches and stored timeout records. Each call applies
-// the library's rules and is undone whole when one refuses.
+// DVPorts and opaque switches. Each call applies the library's rules and is
+// undone whole when one refuses.
 #include <set>
 #include <string>
 
@@ -21,7 +21,6 @@
 #include "tarnctl/store/opaque.h"
 #include "tarnctl/store/pnics.h"
 #include "tarnctl/store/portgroups.h"
-#include "tarnctl/store/timeouts.h"
 #include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Admin {
@@ -145,34 +144,6 @@ void Host::AddOpaqueSwitch(const OpaqueSeed& seed) {
   Store::Opaque::Insert(
       db, seed.name, Store::Meta::NextSeq(db),
       {portset, static_cast<uint32_t>(seed.ports), static_cast<uint32_t>(seed.used), seed.uplinks});
-  transaction.Commit();
-}
-
-void Host::AddUplinkTimeout(const std::string& portset, const std::string& uplink, uint32_t lagId,
-                            uint32_t timeout) {
-  Store::Db& db = state_->db();
-  Scope scope(db, "AddUplinkTimeout");
-  Model::CheckName(NameKind::kPortset, portset);
-  Model::CheckName(NameKind::kUplink, uplink);
-  Model::Check(Model::kTimeout, timeout);
-  Transaction transaction(db);
-  if (!Store::Timeouts::StoreUplink(db, {portset, uplink, lagId, static_cast<uint8_t>(timeout)})) {
-    throw Refused("An uplink timeout for " + portset + ", " + uplink + ", LAG " +
-                  std::to_string(lagId) + " is already stored");
-  }
-  transaction.Commit();
-}
-
-void Host::AddLagTimeout(const std::string& portset, uint32_t lagId, uint32_t timeout) {
-  Store::Db& db = state_->db();
-  Scope scope(db, "AddLagTimeout");
-  Model::CheckName(NameKind::kPortset, portset);
-  Model::Check(Model::kTimeout, timeout);
-  Transaction transaction(db);
-  if (!Store::Timeouts::StoreLag(db, {portset, lagId, static_cast<uint8_t>(timeout)})) {
-    throw Refused("A LAG timeout for " + portset + ", LAG " + std::to_string(lagId) +
-                  " is already stored");
-  }
   transaction.Commit();
 }
 

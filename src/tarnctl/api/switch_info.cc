@@ -3,12 +3,12 @@
 #include "tarnctl/api/create.h"
 #include "tarnctl/api/dvswitch.h"
 #include "tarnctl/api/info_state.h"
+#include "tarnctl/api/remove.h"
 #include "tarnctl/api/switches.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/distributed.h"
 #include "tarnctl/store/opaque.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
@@ -16,30 +16,7 @@ using Instrument::Named;
 using Instrument::Nothing;
 using Instrument::Refused;
 using Store::Layer;
-using Store::Transaction;
 namespace HN = HostCtl::Network;
-
-namespace {
-
-void RemoveStandard(Store::Db& db, const std::string& name) {
-  if (const int64_t used = Store::Standard::ClientCount(db, name); used > 0) {
-    throw Refused("Virtual switch " + name + " has " + std::to_string(used) + " ports in use");
-  }
-  Transaction transaction(db);
-  Store::Standard::Delete(db, name);
-  transaction.Commit();
-}
-
-void RemoveDistributed(Store::Db& db, const std::string& name, const std::string& portset) {
-  if (const int64_t used = Store::Distributed::PortsInUse(db, name); used > 0) {
-    throw Refused("DVS " + name + " has " + std::to_string(used) + " ports in use");
-  }
-  Transaction transaction(db);
-  Store::Distributed::Delete(db, name, portset);
-  transaction.Commit();
-}
-
-}  // namespace
 
 VirtualSwitchInfoImpl::VirtualSwitchInfoImpl()
     : state_(std::make_unique<State>(State{Api::Session::Acquire()})) {
@@ -69,9 +46,10 @@ std::unique_ptr<HN::VirtualSwitch> VirtualSwitchInfoImpl::AddVirtualSwitch(
 void VirtualSwitchInfoImpl::RemoveVirtualSwitch(const std::string& name) {
   Store::Db& db = state_->db();
   TARN_CALL(&db, RemoveVirtualSwitch, Named(name), name);
-  if (Store::Standard::Exists(db, Layer::kRunning, name)) return RemoveStandard(db, name);
+  if (Store::Standard::Exists(db, Layer::kRunning, name))
+    return Api::RemoveStandardSwitch(db, name);
   if (const auto dvs = Store::Distributed::Find(db, Layer::kRunning, name)) {
-    return RemoveDistributed(db, name, dvs->portset);
+    return Api::RemoveDVSwitch(db, name, dvs->portset);
   }
   if (Store::Opaque::Find(db, name)) {
     throw Refused("Opaque switch " + name + " cannot be removed",

@@ -134,4 +134,15 @@ void CheckFreePnic(Store::Db& db, const std::string& pnic) {
   }
 }
 
+void CheckRemovablePnic(Store::Db& db, const std::string& pnic) {
+  if (!Store::Pnics::Exists(db, pnic)) throw Refused("Pnic " + pnic + " does not exist");
+  if (const auto owner = PnicOwner(db, pnic)) {
+    throw Refused("Pnic " + pnic + " is linked to " + *owner);
+  }
+  if (const auto stored = Store::Pnics::LinkedSwitch(db, Layer::kStored, pnic)) {
+    throw Refused("Pnic " + pnic + " is linked to " + *stored + " in the stored configuration",
+                  "(a restore would link it again)");
+  }
+}
+
 }  // namespace TarnCtl::Model

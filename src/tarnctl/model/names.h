@@ -62,5 +62,9 @@ void CheckNewSwitchName(Store::Db& db, NameKind kind, const std::string& name);
 std::optional<std::string> PnicOwner(Store::Db& db, const std::string& pnic);
 // Refuses a pnic that does not exist or that a running switch uses.
 void CheckFreePnic(Store::Db& db, const std::string& pnic);
+// Refuses to remove a pnic that does not exist, that a running switch
+// uses, or that the stored configuration or the distributed switch cache
+// links: a restore would link it again, and every link names a pnic.
+void CheckRemovablePnic(Store::Db& db, const std::string& pnic);
 
 }  // namespace TarnCtl::Model

@@ -40,13 +40,25 @@ constexpr size_t kHeaderSize = 100;
 constexpr size_t kUserVersionOffset = 60;
 constexpr size_t kApplicationIdOffset = 68;
 
-HostCtlException CannotOpen(const std::string& path, const std::string& cause) {
-  const std::string text = "Cannot open host database " + path + ": " + cause;
+// What to do about a host file that cannot be used: every such message ends
+// with one of these, so that its one line names the file, the cause and the
+// way out.
+constexpr const char* kReplace =
+    "set TARN_HOST_DB to a host file, or move it away and run tarnhost init";
+constexpr const char* kAnother = "set TARN_HOST_DB to a host file";
+constexpr const char* kInit = "run tarnhost init";
+constexpr const char* kNewer =
+    "use the newer release that made it, or set TARN_HOST_DB to another host file";
+constexpr const char* kReach = "check the path and its permissions, or set TARN_HOST_DB";
+constexpr const char* kWritable = "set TARN_HOST_DB to a file in a writable directory";
+
+HostCtlException CannotOpen(const std::string& path, const std::string& cause, const char* remedy) {
+  const std::string text = "Cannot open host database " + path + ": " + cause + "; " + remedy;
   return HostCtlException(text, text);
 }
 
 HostCtlException CannotCreate(const std::string& path, const std::string& cause) {
-  const std::string text = "Cannot create host database " + path + ": " + cause;
+  const std::string text = "Cannot create host database " + path + ": " + cause + "; " + kWritable;
   return HostCtlException(text, text);
 }
 
@@ -77,10 +89,10 @@ int32_t BigEndian32(const unsigned char* bytes) {
 int OpenForLock(const std::string& path, bool create) {
   int fd = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
   if (fd >= 0 || errno != ENOENT) {
-    if (fd < 0) throw CannotOpen(path, std::strerror(errno));
+    if (fd < 0) throw CannotOpen(path, std::strerror(errno), kReach);
     return fd;
   }
-  if (!create) throw CannotOpen(path, "no host yet (tarnhost init makes one)");
+  if (!create) throw CannotOpen(path, "no host yet", kInit);
   PrepareDirectory(path);
   fd = open(path.c_str(), O_RDONLY | O_CREAT | O_CLOEXEC | O_NOCTTY, 0644);
   if (fd < 0) throw CannotCreate(path, std::strerror(errno));
@@ -93,7 +105,7 @@ void Lock(int fd, const std::string& path, int timeoutSeconds) {
   while (flock(fd, LOCK_EX | LOCK_NB) != 0) {
     if (errno == EINTR) continue;
     if (errno != EWOULDBLOCK)
-      throw CannotOpen(path, std::string("cannot lock it: ") + std::strerror(errno));
+      throw CannotOpen(path, std::string("cannot lock it: ") + std::strerror(errno), kReach);
     if (std::chrono::steady_clock::now() >= deadline) {
       const std::string text = "Host " + path + " is busy: another process holds its lock";
       throw HostCtlException(text, text + " (waited " + std::to_string(timeoutSeconds) + " s)");
@@ -106,31 +118,34 @@ void Lock(int fd, const std::string& path, int timeoutSeconds) {
 // Refuses what is not a host database of a version this library reads;
 // false for an empty file (no host yet).
 bool CheckHeader(int fd, const struct stat& info, const std::string& path) {
-  if (S_ISDIR(info.st_mode)) throw CannotOpen(path, "is a directory");
-  if (!S_ISREG(info.st_mode)) throw CannotOpen(path, "is not a regular file");
+  if (S_ISDIR(info.st_mode)) throw CannotOpen(path, "is a directory", kAnother);
+  if (!S_ISREG(info.st_mode)) throw CannotOpen(path, "is not a regular file", kAnother);
   if (info.st_size == 0) return false;
   unsigned char header[kHeaderSize] = {};
   const ssize_t read = pread(fd, header, sizeof header, 0);
-  if (read < 0) throw CannotOpen(path, std::strerror(errno));
+  if (read < 0) throw CannotOpen(path, std::strerror(errno), kReach);
   if (static_cast<size_t>(read) < sizeof kSqliteMagic ||
       std::memcmp(header, kSqliteMagic, sizeof kSqliteMagic) != 0) {
-    throw CannotOpen(path, "not a host database (not an SQLite database)");
+    throw CannotOpen(path, "not a host database (not an SQLite database)", kReplace);
   }
   if (static_cast<size_t>(read) < kHeaderSize) {
-    throw CannotOpen(path, "not a host database (truncated header)");
+    throw CannotOpen(path, "not a host database (truncated header)", kReplace);
   }
   const int32_t applicationId = BigEndian32(header + kApplicationIdOffset);
   if (applicationId != kApplicationId) {
     char hex[32];
     std::snprintf(hex, sizeof hex, "0x%x", static_cast<unsigned>(applicationId));
-    throw CannotOpen(path, std::string("not a host database (application id ") + hex + ")");
+    throw CannotOpen(path, std::string("not a host database (application id ") + hex + ")",
+                     kReplace);
   }
   const int32_t version = BigEndian32(header + kUserVersionOffset);
   if (version > kSchemaVersion) {
-    throw CannotOpen(path, "schema version " + std::to_string(version) +
-                               " is newer than this library's " + std::to_string(kSchemaVersion));
+    throw CannotOpen(path,
+                     "schema version " + std::to_string(version) +
+                         " is newer than this library's " + std::to_string(kSchemaVersion),
+                     kNewer);
   }
-  if (version < 1) throw CannotOpen(path, "not a host database (no schema version)");
+  if (version < 1) throw CannotOpen(path, "not a host database (no schema version)", kReplace);
   return true;
 }
 
@@ -138,12 +153,14 @@ bool CheckHeader(int fd, const struct stat& info, const std::string& path) {
 // links resolved, and of hard links in one directory the least name.
 std::string JournalPath(const std::string& path, const struct stat& info) {
   char resolved[PATH_MAX];
-  if (realpath(path.c_str(), resolved) == nullptr) throw CannotOpen(path, std::strerror(errno));
+  if (realpath(path.c_str(), resolved) == nullptr) {
+    throw CannotOpen(path, std::strerror(errno), kReach);
+  }
   const std::string real = resolved;
   if (info.st_nlink <= 1) return real;
   const std::string directory = Directory(real);
   DIR* dir = opendir(directory.c_str());
-  if (dir == nullptr) throw CannotOpen(path, std::strerror(errno));
+  if (dir == nullptr) throw CannotOpen(path, std::strerror(errno), kReach);
   std::vector<std::string> names;
   while (const dirent* entry = readdir(dir)) {
     struct stat other;
@@ -157,7 +174,8 @@ std::string JournalPath(const std::string& path, const struct stat& info) {
   if (names.size() < info.st_nlink || names.empty()) {
     throw CannotOpen(path,
                      "it has a hard link in another directory, and runs through the two names "
-                     "would not share their journal; use a symbolic link instead");
+                     "would not share their journal",
+                     "use a symbolic link instead");
   }
   return directory + "/" + *std::min_element(names.begin(), names.end());
 }
@@ -207,7 +225,7 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
     try {
       Lock(fd, path, options.lockTimeoutSeconds);
       struct stat held, named;
-      if (fstat(fd, &held) != 0) throw CannotOpen(path, std::strerror(errno));
+      if (fstat(fd, &held) != 0) throw CannotOpen(path, std::strerror(errno), kReach);
       if (stat(path.c_str(), &named) != 0 || named.st_ino != held.st_ino ||
           named.st_dev != held.st_dev) {
         close(fd);  // replaced or removed while we waited: take the new one
@@ -215,14 +233,14 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
       }
       const bool hasHost = CheckHeader(fd, held, path);
       if (!hasHost && !options.create) {
-        throw CannotOpen(path, "no host yet (empty file; tarnhost init makes one)");
+        throw CannotOpen(path, "no host yet (empty file)", kInit);
       }
       auto db = Db::OpenFile(JournalPath(path, held), path);
       try {
         // Reading the schema finds a file that is damaged past its header.
         db->Exec("PRAGMA synchronous=FULL; SELECT count(*) FROM sqlite_schema");
       } catch (const HostCtlException& e) {
-        throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2));
+        throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2), kReplace);
       }
       if (!hasHost) {
         try {

@@ -6,11 +6,11 @@
 //    Open() polls for it for `lockTimeoutSeconds` (0: one try) and then
 //    throws "Host <path> is busy: another process holds its lock".
 //  - Before SQLite sees a file, Open() reads its header and refuses
-//    ("Cannot open host database <path>: <cause>") anything that is not a
-//    host database of a version this library knows: another application's
-//    SQLite file (whatever journal or log lies beside it), a newer schema,
-//    a directory, a device. Such a file is left exactly as it was and
-//    nothing is created beside it.
+//    ("Cannot open host database <path>: <cause>; <what to do>") anything
+//    that is not a host database of a version this library knows: another
+//    application's SQLite file (whatever journal or log lies beside it), a
+//    newer schema, a directory, a device. Such a file is left exactly as it
+//    was and nothing is created beside it.
 //  - A missing or empty file is no host yet: with `create`, Open() builds
 //    the default host in it in one transaction (a crash leaves an empty
 //    file, which the next Open() fills) and created() says so.

@@ -112,4 +112,11 @@ std::vector<std::string> Clients(Db& db, const std::string& portGroup) {
   return names;
 }
 
+std::vector<Client> AllClients(Db& db) {
+  std::vector<Client> clients;
+  auto select = db.Prepare("SELECT portgroup, name FROM client ORDER BY seq, portgroup, name");
+  while (select.Step()) clients.push_back({select.Text(0), select.Text(1)});
+  return clients;
+}
+
 }  // namespace TarnCtl::Store::PortGroups

@@ -49,5 +49,12 @@ void RemoveClient(Db& db, const std::string& portGroup, const std::string& clien
 int64_t ClientCount(Db& db, const std::string& portGroup);
 // In the order they were added.
 std::vector<std::string> Clients(Db& db, const std::string& portGroup);
+struct Client {
+  std::string portGroup;
+  std::string name;
+};
+// Every client of the host, of existing port groups or not, in the order
+// they were added.
+std::vector<Client> AllClients(Db& db);
 
 }  // namespace TarnCtl::Store::PortGroups

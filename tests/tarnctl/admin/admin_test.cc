@@ -94,7 +94,7 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
 }
 
 // The refusals the tarnhost transcript does not already show.
-TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
+TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
   const std::string tooLong(32, 'x');
   auto dvs = [](TarnCtl::Admin::DVSwitchSeed seed) {
     return [seed](Host& h) { h.AddDVSwitch(seed); };
@@ -149,6 +149,17 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
          h.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
        },
        "Unknown operation SetVlanID"},
+      {"removing a pnic of opaque", [](Host& h) { h.RemovePnic("pnic3"); }, "linked to opq0"},
+      {"dvs by portset", [](Host& h) { h.RemoveDVSwitch("ps0"); }, "DVS ps0 does not exist"},
+      {"dvport unknown", [](Host& h) { h.RemoveDVPort("dvs0", "102"); },
+       "DVPort 102 does not exist on dvs0"},
+      {"opaque not a dvs", [](Host& h) { h.RemoveOpaqueSwitch("dvs0"); }, "does not exist"},
+      {"client of another port group", [](Host& h) { h.RemoveClient("pg1", "vm1"); },
+       "Client vm1 is not on portgroup pg1"},
+      {"uplink timeout of another LAG",
+       [](Host& h) { h.RemoveUplinkTimeout("vswitch0", "pnic0", 8); },
+       "No uplink timeout for vswitch0, pnic0, LAG 8 is stored"},
+      {"fault unknown", [](Host& h) { h.RemoveFault(3); }, "Fault 3 does not exist"},
   };
   Host host;
   Seed(host);
@@ -156,13 +167,48 @@ TEST_F(AdminTest, SeedingRefusesAndChangesNothing) {
   for (const auto& c : cases) {
     const auto [message, detail] = Refused([&] { c.call(host); });
     EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
-    EXPECT_EQ(detail.rfind("Add", 0), 0u) << c.what;
+    EXPECT_TRUE(detail.starts_with("Add") || detail.starts_with("Remove")) << c.what;
     EXPECT_EQ(host.Dump(), before) << c.what;
   }
   EXPECT_EQ(Refused([&] {
               host.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
             }).second,
             "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)");
+}
+
+// What seeding adds, removal takes away whole: a distributed switch from
+// the cache too, with its DVPorts; a fault keeps its number while armed.
+TEST_F(AdminTest, RemovalUndoesSeeding) {
+  using TarnCtl::Admin::Listing;
+  Host host;
+  const std::string before = host.Show();
+  host.AddPnic("pnic4");
+  host.AddClient("Management", "vm1");
+  host.AddSystemSwitch("sys0", 64);
+  host.AddDVSwitch({"dvs0", "ps0", std::nullopt, 128, 1500, {"pnic1"}});
+  host.AddDVPort({"dvs0", "100", {}, 0});
+  host.AddOpaqueSwitch({"opq0", std::nullopt, 32, 5, {"pnic4"}});
+  host.AddUplinkTimeout("vswitch0", "pnic0", 7, 255);
+  host.AddLagTimeout("ps0", 3, 0);
+  host.AddFault({"SetVlanId", "pg2", {}, {}, 0, 1});
+  host.AddFault({"GetName", {}, "a\tb", {}, 0, 1});
+  EXPECT_EQ(host.List(Listing::kPnics)[4], (TarnCtl::Admin::ListRow{"pnic4", "opq0", ""}));
+  EXPECT_EQ(host.List(Listing::kClients),
+            (std::vector<TarnCtl::Admin::ListRow>{{"Management", "vm1"}}));
+  host.RemoveFault(1);
+  EXPECT_EQ(host.List(Listing::kFaults),
+            (std::vector<TarnCtl::Admin::ListRow>{
+                {"2", "GetName", "", "0", "1", "\"a\\tb\"", "\"injected fault in GetName\""}}));
+  host.RemoveFault(2);
+  host.RemoveOpaqueSwitch("opq0");
+  host.RemovePnic("pnic4");
+  host.RemoveDVSwitch("dvs0");
+  host.RemoveSystemSwitch("sys0");
+  host.RemoveClient("Management", "vm1");
+  host.RemoveUplinkTimeout("vswitch0", "pnic0", 7);
+  host.RemoveLagTimeout("ps0", 3);
+  EXPECT_EQ(host.Show(), before);
+  EXPECT_TRUE(host.List(Listing::kDVPorts).empty());
 }
 
 TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {

@@ -103,11 +103,10 @@ TEST_F(StoreTest, AMissingOrEmptyFileBecomesTheDefaultHostInPlace) {
   EXPECT_FALSE(Open(missing)->created());
   // Nothing but the host files themselves: no lock files, no journals.
   EXPECT_EQ(Listing(), (std::vector<std::string>{"empty.db", "sub"}));
-  EXPECT_EQ(
-      Refusal([&] {
-        HostFile::Open(Location::File(Path("none.db")), {0, false});
-      }),
-      "Cannot open host database " + Path("none.db") + ": no host yet (tarnhost init makes one)");
+  EXPECT_EQ(Refusal([&] {
+              HostFile::Open(Location::File(Path("none.db")), {0, false});
+            }),
+            "Cannot open host database " + Path("none.db") + ": no host yet; run tarnhost init");
 }
 
 // What is not a host of this library is refused as it is: its bytes stay,
@@ -135,19 +134,24 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
   const struct {
     const char* name;
     const char* cause;
+    const char* remedy;  // how the line ends
   } cases[] = {
-      {"foreign.db", "not a host database (application id 0x7)"},
-      {"newer.db", "schema version 9 is newer than this library's 1"},
-      {"text.db", "not a host database (not an SQLite database)"},
-      {"short.db", "not a host database (truncated header)"},
-      {"dir.db", "is a directory"},
-      {"fifo.db", "is not a regular file"},
+      {"foreign.db", "not a host database (application id 0x7)",
+       "move it away and run tarnhost init"},
+      {"newer.db", "schema version 9 is newer than this library's 1", "another host file"},
+      {"text.db", "not a host database (not an SQLite database)", "run tarnhost init"},
+      {"short.db", "not a host database (truncated header)", "run tarnhost init"},
+      {"dir.db", "is a directory", "; set TARN_HOST_DB to a host file"},
+      {"fifo.db", "is not a regular file", "; set TARN_HOST_DB to a host file"},
   };
   const auto before = Listing();
   for (const auto& c : cases) {
     const std::string path = Path(c.name);
     const std::string bytes = fs::is_regular_file(path) ? Bytes(path) : "";
-    EXPECT_EQ(Refusal([&] { Open(path); }), "Cannot open host database " + path + ": " + c.cause);
+    const std::string message = Refusal([&] { Open(path); });
+    EXPECT_EQ(message.rfind("Cannot open host database " + path + ": " + c.cause + "; ", 0), 0u)
+        << message;
+    EXPECT_TRUE(message.ends_with(c.remedy)) << message;
     if (fs::is_regular_file(path)) {
       EXPECT_EQ(Bytes(path), bytes) << c.name;
     }

@@ -53,13 +53,6 @@ std::string Quote(const std::string& text) {
   return "\"" + text + "\"";
 }
 
-// A refusal's text with its explanation, without the operation's name.
-std::string Reason(const HostCtlException& refusal) {
-  const std::string detail = refusal.GetDetailedMessage();
-  const auto colon = detail.find(": ");
-  return colon == std::string::npos ? detail : detail.substr(colon + 2);
-}
-
 std::string FromHex(const std::string& hex, bool& ok) {
   auto digit = [](char c) -> int {
     if (c >= '0' && c <= '9') return c - '0';
