@@ -116,14 +116,6 @@ constexpr bool IsFunction(std::string_view function, std::string_view operation)
     return static_cast<::TarnCtl::Instrument::Op>(index);             \
   }()
 
-// The registered operation `op`; does not compile for an unknown one.
-#define TARN_OPERATION(op)                                            \
-  [] {                                                                \
-    constexpr int index = ::TarnCtl::Instrument::OperationIndex(#op); \
-    static_assert(index >= 0, "operation " #op " is not registered"); \
-    return static_cast<::TarnCtl::Instrument::Op>(index);             \
-  }()
-
 #define TARN_CHECK_OPERATION(op)                                                               \
   static_assert(                                                                               \
       ::TarnCtl::Instrument::IsFunction(std::source_location::current().function_name(), #op), \
