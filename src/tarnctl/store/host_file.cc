@@ -238,7 +238,11 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
       auto db = Db::OpenFile(JournalPath(path, held), path);
       try {
         // Reading the schema finds a file that is damaged past its header.
-        db->Exec("PRAGMA synchronous=FULL; SELECT count(*) FROM sqlite_schema");
+        // Pages are read through a mapping of the file rather than a read()
+        // each: a lookup costs no system call per level of its tree.
+        db->Exec(
+            "PRAGMA synchronous=FULL; PRAGMA mmap_size=1073741824;"
+            " SELECT count(*) FROM sqlite_schema");
       } catch (const HostCtlException& e) {
         throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2), kReplace);
       }

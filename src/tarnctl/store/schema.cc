@@ -7,24 +7,25 @@ namespace TarnCtl::Store {
 // with the host (the rows of one switch); small sets are sorted instead.
 // Values are checked by the model and bound with their types by the store,
 // so columns carry no declared type or constraint of their own. Layered
-// tables put `layer` first in every key.
+// tables put `layer` after the name in their keys: a change goes to both
+// layers, whose rows then share a page.
 const char* const kSchemaSql = R"sql(
 CREATE TABLE meta(key PRIMARY KEY, value) WITHOUT ROWID;
 CREATE TABLE pnic(seq INTEGER PRIMARY KEY, name UNIQUE);
 CREATE TABLE vswitch(layer, name, seq, num_ports, mtu, cdp, system, policy,
-  PRIMARY KEY(layer, name)) WITHOUT ROWID;
-CREATE TABLE portgroup(layer, name, switch, seq, vlan, policy, PRIMARY KEY(layer, name))
+  PRIMARY KEY(name, layer)) WITHOUT ROWID;
+CREATE TABLE portgroup(layer, name, switch, seq, vlan, policy, PRIMARY KEY(name, layer))
   WITHOUT ROWID;
-CREATE INDEX portgroup_switch ON portgroup(layer, switch, seq, vlan, policy);
-CREATE TABLE link(layer, pnic, switch, seq, PRIMARY KEY(layer, pnic)) WITHOUT ROWID;
-CREATE INDEX link_switch ON link(layer, switch, seq);
+CREATE INDEX portgroup_switch ON portgroup(switch, layer, seq, vlan, policy);
+CREATE TABLE link(layer, pnic, switch, seq, PRIMARY KEY(pnic, layer)) WITHOUT ROWID;
+CREATE INDEX link_switch ON link(switch, layer, seq);
 CREATE TABLE client(portgroup, name, seq, PRIMARY KEY(portgroup, name)) WITHOUT ROWID;
 CREATE TABLE dvswitch(layer, name, portset, switch_id, uuid, impl_class, version, num_ports,
-  mtu, seq, PRIMARY KEY(layer, name), UNIQUE(layer, portset), UNIQUE(layer, switch_id))
+  mtu, seq, PRIMARY KEY(name, layer), UNIQUE(layer, portset), UNIQUE(layer, switch_id))
   WITHOUT ROWID;
-CREATE TABLE dvs_uplink(layer, pnic, dvs, port_id, seq, PRIMARY KEY(layer, pnic))
+CREATE TABLE dvs_uplink(layer, pnic, dvs, port_id, seq, PRIMARY KEY(pnic, layer))
   WITHOUT ROWID;
-CREATE INDEX dvs_uplink_dvs ON dvs_uplink(layer, dvs, seq);
+CREATE INDEX dvs_uplink_dvs ON dvs_uplink(dvs, layer, seq);
 CREATE TABLE dvport(dvs, port_id, connection_id, seq, PRIMARY KEY(dvs, port_id)) WITHOUT ROWID;
 CREATE TABLE dvport_client(dvs, port_id, name, seq, PRIMARY KEY(dvs, port_id, name))
   WITHOUT ROWID;
