@@ -1,14 +1,8 @@
 // Distributed and opaque switches, DVPorts, ENS and timeouts through the
 // interface: what the tool relies on beyond the refusals.
 #include "host_fixture.h"
-#include "hostctl/nodi.h"
 
 namespace {
-
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::DVPortImpl;
-using TarnCtl::Network::NetworkInfoImpl;
 
 using DvsTest = HostTest;
 

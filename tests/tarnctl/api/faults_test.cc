@@ -2,16 +2,11 @@
 // down, that the counts are kept across sessions and processes, and the
 // node calls' own ways of failing.
 #include "host_fixture.h"
-#include "hostctl/nodi.h"
 #include "tarnctl/api/session.h"
 
 namespace {
 
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
 using TarnCtl::Admin::FaultSeed;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
 
 using FaultTest = HostTest;
 

@@ -5,11 +5,6 @@
 
 namespace {
 
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
-
 using LayersTest = HostTest;
 
 // The running state, as the administration shows it.

@@ -2,15 +2,9 @@
 // HostCtlException with a short message and a detailed message that starts
 // with the operation's name, and none of them changes the host.
 #include "host_fixture.h"
-#include "hostctl/nodi.h"
 
 namespace {
 
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::DVPortImpl;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
 using TarnCtl::Network::VirtualSwitchImpl;
 
 using RefusalTest = HostTest;

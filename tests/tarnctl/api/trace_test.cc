@@ -2,15 +2,8 @@
 // the format of src/tarnctl/trace.h. (The node calls' lines: the ens
 // transcript.)
 #include "host_fixture.h"
-#include "hostctl/nodi.h"
 
 namespace {
-
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::DVPortImpl;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
 
 using TraceTest = HostTest;
 

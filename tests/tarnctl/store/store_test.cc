@@ -1,16 +1,9 @@
 // The host file below the library: where it lives, what is refused without
 // being touched, creation in place, the lock on the file whatever path
 // reaches it, transactions, and the reset from the known schema.
-#include <fcntl.h>
-#include <gtest/gtest.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
-#include <filesystem>
-#include <fstream>
-#include <sstream>
-
+#include "scratch.h"
 #include "tarnctl/store/host_file.h"
 #include "tarnctl/store/pnics.h"
 #include "tarnctl/store/policy_codec.h"
@@ -21,35 +14,12 @@
 namespace {
 
 namespace fs = std::filesystem;
-using HostCtl::Lib::HostCtlException;
 using namespace TarnCtl::Store;
 
-class StoreTest : public ::testing::Test {
+class StoreTest : public ScratchTest {
  protected:
-  void SetUp() override {
-    char pattern[] = "/tmp/store-test-XXXXXX";
-    ASSERT_NE(mkdtemp(pattern), nullptr);
-    dir_ = pattern;
-  }
-  void TearDown() override { fs::remove_all(dir_); }
-
-  std::string Path(const std::string& name) const { return dir_ + "/" + name; }
   static std::unique_ptr<HostFile> Open(const std::string& path, int lockTimeout = 0) {
     return HostFile::Open(Location::File(path), {lockTimeout, true});
-  }
-  static std::string Refusal(const std::function<void()>& body) {
-    try {
-      body();
-    } catch (const HostCtlException& e) {
-      return e.GetMessage();
-    }
-    return "";
-  }
-  static std::string Bytes(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    std::stringstream bytes;
-    bytes << in.rdbuf();
-    return bytes.str();
   }
   // The names in the directory, sorted.
   std::vector<std::string> Listing() const {
@@ -60,16 +30,6 @@ class StoreTest : public ::testing::Test {
     std::sort(names.begin(), names.end());
     return names;
   }
-  // Runs `body` in a child process; its exit status.
-  static int InChild(const std::function<int()>& body) {
-    const pid_t pid = fork();
-    if (pid == 0) _exit(body());
-    int status = 0;
-    waitpid(pid, &status, 0);
-    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-  }
-
-  std::string dir_;
 };
 
 TEST_F(StoreTest, LocationFollowsTheEnvironment) {
@@ -147,16 +107,16 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
   const auto before = Listing();
   for (const auto& c : cases) {
     const std::string path = Path(c.name);
-    const std::string bytes = fs::is_regular_file(path) ? Bytes(path) : "";
+    const std::string bytes = fs::is_regular_file(path) ? ReadFile(path) : "";
     const std::string message = Refusal([&] { Open(path); });
     EXPECT_EQ(message.rfind("Cannot open host database " + path + ": " + c.cause + "; ", 0), 0u)
         << message;
     EXPECT_TRUE(message.ends_with(c.remedy)) << message;
     if (fs::is_regular_file(path)) {
-      EXPECT_EQ(Bytes(path), bytes) << c.name;
+      EXPECT_EQ(ReadFile(path), bytes) << c.name;
     }
   }
-  EXPECT_EQ(Bytes(Path("foreign.db-wal")), Bytes(Path("saved-wal")));
+  EXPECT_EQ(ReadFile(Path("foreign.db-wal")), ReadFile(Path("saved-wal")));
   EXPECT_EQ(Listing(), before);
 }
 
