@@ -62,13 +62,25 @@ TEST_F(ModelTest, NamesAreShortPrintableTextWithoutCommasWhereListed) {
 }
 
 TEST_F(ModelTest, RangesAndWordsSayWhatTheyAccept) {
-  EXPECT_EQ(Detail([] { Model::Check(Model::kPorts, 7); }),
-            "Rule: Invalid number of ports 7 (8-4096)");
-  EXPECT_EQ(Detail([] { Model::Check(Model::kMaxActive, -1); }),
-            "Rule: Invalid max active uplinks -1 (it must be 0 or more)");
+  const struct {
+    const Model::Range& range;
+    int64_t value;
+    const char* refusal;
+  } cases[] = {
+      {Model::kPorts, 8, ""},
+      {Model::kPorts, 7, "Rule: Invalid number of ports 7 (8-4096)"},
+      {Model::kPorts, 4097, "Rule: Invalid number of ports 4097 (8-4096)"},
+      {Model::kMtu, 9000, ""},
+      {Model::kMtu, 9001, "Rule: MTU 9001 is out of range (1280-9000)"},
+      {Model::kCdpStatus, -1, "Rule: Invalid CDP status -1 (0-3)"},
+      {Model::kMaxActive, -1, "Rule: Invalid max active uplinks -1 (it must be 0 or more)"},
+      {Model::kDvsVersion, -1, "Rule: Invalid DVS version -1"},
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(Detail([&] { Model::Check(c.range, c.value); }), c.refusal) << c.value;
+  }
   EXPECT_EQ(Detail([] { Model::Check(Model::kUsedPorts, 9, 8); }),
             "Rule: Invalid number of used ports 9 (0-8)");
-  EXPECT_EQ(Detail([] { Model::Check(Model::kDvsVersion, -1); }), "Rule: Invalid DVS version -1");
   EXPECT_EQ(Detail([] { Model::CdpStatusOfWord("Both"); }),
             "Rule: Unknown CDP status Both (expected down, listen, advertise or both)");
   EXPECT_EQ(Model::CdpWord(2), "advertise");
