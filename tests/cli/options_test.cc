@@ -1,7 +1,6 @@
 // The option loop: bits, fields, conversions and getopt_long conventions.
 #include <gtest/gtest.h>
 
-#include <cstdio>
 #include <string>
 #include <vector>
 
@@ -32,22 +31,6 @@ Parsed Parse(const Args& args) {
   parsed.options = Cli::ParseCommandLine(argc, argv.data(), parsed.firstOperand);
   for (int i = parsed.firstOperand; i < argc; ++i) parsed.operands.push_back(argv[i]);
   return parsed;
-}
-
-// For death tests: the usage text that follows an error is not wanted here.
-void ParseQuietly(const Args& args) {
-  if (std::freopen("/dev/null", "w", stdout) == nullptr) return;
-  Parse(args);
-}
-
-// The whole of standard error must be `line` and its newline.
-std::string WholeLine(const std::string& line) {
-  std::string regex = "^";
-  for (char c : line) {
-    if (std::string(".[]()*+?{}|^$\\").find(c) != std::string::npos) regex += '\\';
-    regex += c;
-  }
-  return regex + "\n$";
 }
 
 std::string Show(const Args& args) {
@@ -178,22 +161,6 @@ TEST(ParseCommandLine, LeavesOperandsBehindTheOptions) {
     EXPECT_EQ(parsed.firstOperand, c.firstOperand) << Show(c.args);
     EXPECT_EQ(parsed.operands, c.operands) << Show(c.args);
   }
-}
-
-// The ways out that the parse_errors and usage transcripts do not take.
-TEST(ParseCommandLineDeathTest, EndsTheProcess) {
-  const struct {
-    Args args;
-    std::string stderrRegex;
-  } cases[] = {
-      {{"-R", "-y", "-R"}, WholeLine("Error, only one command can be performed at a time.")},
-      // delete does not stand for add.
-      {{"-d", "-W", "--impl-class=c"},
-       WholeLine("Error, add must be specified in order to use impl-class")},
-      {{"-v", "7 "}, WholeLine("Invalid vlan id.  Vlan must be between 0-4095: 7 ")},
-  };
-  for (const auto& c : cases)
-    EXPECT_EXIT(ParseQuietly(c.args), ::testing::ExitedWithCode(1), c.stderrRegex) << Show(c.args);
 }
 
 }  // namespace
