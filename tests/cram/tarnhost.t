@@ -132,7 +132,6 @@ status 1, nothing changed.
   > timeout uplink vs0 u1 1 256
   > fault add GetName --times 0
   > fault add ''
-  > show --json nosuch
   > pnic del pnic0
   > pnic del pnic9
   > client del Management vm9
@@ -154,7 +153,6 @@ status 1, nothing changed.
   status 1 tarnhost: Invalid timeout 256 (0-255)
   status 1 tarnhost: Invalid times 0 (it must be 1 or more)
   status 1 tarnhost: Fault operation is empty
-  status 1 tarnhost: No standard switch, distributed switch or port group is named nosuch in either layer
   status 1 tarnhost: Pnic pnic0 is linked to vswitch0
   status 1 tarnhost: Pnic pnic9 does not exist
   status 1 tarnhost: Client vm9 is not on portgroup Management
