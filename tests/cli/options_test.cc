@@ -103,7 +103,6 @@ TEST(ParseCommandLine, StoresStringArgumentsLastOneWins) {
       {{"-Lpnic1"}, &CommandOptions::uplinkName, "pnic1"},
       {{"-P", "u1", "-V", "7"}, &CommandOptions::uplinkName, "u1"},
       {{"-P", "u1", "-V", "7"}, &CommandOptions::dvPortId, "7"},
-      {{"-A", "b", "-p", "a"}, &CommandOptions::portGroupName, "a"},
       {{"-p", "a", "-A", "b"}, &CommandOptions::portGroupName, "b"},
       {{"-M", "u", "-p", "a", "--pg", "c"}, &CommandOptions::portGroupName, "c"},
       {{"-B", "down"}, &CommandOptions::cdpStatus, "down"},

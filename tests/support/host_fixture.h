@@ -74,19 +74,10 @@ class HostTest : public ScratchTest {
     vs1->AddPortGroup("pg2");
     host.AddClient("pg1", "vm-a");
     host.AddClient("pg1", "vm-b");
-    TarnCtl::Admin::DVSwitchSeed dvs;
-    dvs.name = "dvs0";
-    dvs.portset = "dvs0-ps";
-    dvs.switchId = "dvs-dvs0";
-    dvs.uplinks = {"pnic2"};
-    host.AddDVSwitch(dvs);
+    host.AddDVSwitch({"dvs0", "dvs0-ps", "dvs-dvs0", 128, 1500, {"pnic2"}});
     host.AddDVPort({"dvs0", "100", {"vm-c"}, 5});
     host.AddDVPort({"dvs0", "101", {}, 0});
-    TarnCtl::Admin::OpaqueSeed opaque;
-    opaque.name = "op0";
-    opaque.portset = "op0-ps";
-    opaque.uplinks = {"pnic3"};
-    host.AddOpaqueSwitch(opaque);
+    host.AddOpaqueSwitch({"op0", "op0-ps", 128, 0, {"pnic3"}});
   }
 
   std::string path_;
