@@ -215,24 +215,30 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   Host host;
   Seed(host);
   const std::string good = host.Dump();
-  // The dump with `change` made to its document.
-  auto changed = [&](const std::function<void(Json&)>& change) {
-    Json document = Json::parse(good);
-    change(document["tables"]);
-    return document.dump(2);
-  };
-  auto whole = [&](const std::function<void(Json&)>& change) {
-    Json document = Json::parse(good);
-    change(document);
-    return document.dump(2);
-  };
-  auto row = [](Json& tables, const char* table, const char* key,
-                const std::string& value) -> Json& {
-    for (auto& r : tables[table]) {
-      if (r[key] == value) return r;
+  const Json document = Json::parse(good);
+  // The pointer to the first row of `table` with that name (meta's: key).
+  auto at = [&](const std::string& table, const std::string& name) {
+    const Json& rows = document["tables"][table];
+    for (size_t i = 0; i < rows.size(); ++i) {
+      if (rows[i].value("name", rows[i].value("key", "")) == name) {
+        return "/tables/" + table + "/" + std::to_string(i);
+      }
     }
-    throw std::runtime_error(std::string("no row ") + value);
+    throw std::runtime_error("no row " + name);
   };
+  // The dump with `value` put at `pointer`, or what is there removed.
+  auto with = [&](const std::string& pointer, const std::optional<Json>& value) {
+    Json changed = document;
+    const Json::json_pointer where(pointer);
+    if (value) {
+      changed[where] = *value;
+    } else {
+      changed[where.parent_pointer()].erase(where.back());
+    }
+    return changed.dump(2);
+  };
+  const std::string sys0 = at("vswitch", "sys0"), management = at("portgroup", "Management");
+  const std::string nextSeq = at("meta", "next_seq") + "/value";
   const struct {
     const char* what;
     std::string text;
@@ -240,58 +246,36 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   } cases[] = {
       {"trailing text", good + "x", "not valid JSON"},
       {"array", "[]", "a dump is a JSON object"},
-      {"version as text", whole([](Json& d) { d["version"] = "1"; }), "must be an integer"},
-      {"version missing", whole([](Json& d) { d.erase("version"); }), "key \"version\" is missing"},
-      {"format wrong", whole([](Json& d) { d["format"] = "other"; }), "\"format\" must be"},
-      {"table unknown", changed([](Json& t) { t["faults"] = Json::array(); }),
-       "unknown table \"faults\""},
-      {"table not an array", changed([](Json& t) { t["ens"] = Json::object(); }),
-       "table \"ens\" must be an array"},
-      {"field missing",
-       changed([&](Json& t) { row(t, "portgroup", "name", "Management").erase("vlan"); }),
+      {"version as text", with("/version", "1"), "must be an integer"},
+      {"version missing", with("/version", {}), "key \"version\" is missing"},
+      {"format wrong", with("/format", "other"), "\"format\" must be"},
+      {"table unknown", with("/tables/faults", Json::array()), "unknown table \"faults\""},
+      {"table not an array", with("/tables/ens", Json::object()), "table \"ens\" must be an array"},
+      {"field missing", with(management + "/vlan", {}),
        "table \"portgroup\", row 1, field \"vlan\": is missing"},
-      {"field unknown", changed([&](Json& t) { row(t, "pnic", "name", "pnic4")["colour"] = 1; }),
-       "unknown field \"colour\""},
-      {"wrong type",
-       changed([&](Json& t) { row(t, "portgroup", "name", "Management")["vlan"] = "0"; }),
-       "must be an integer"},
-      {"mtu", changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["mtu"] = -1500; }),
-       "MTU -1500 is out of range (1280-9000)"},
-      {"name with a newline",
-       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic5\nx"; }),
+      {"field unknown", with(at("pnic", "pnic4") + "/colour", 1), "unknown field \"colour\""},
+      {"wrong type", with(management + "/vlan", "0"), "must be an integer"},
+      {"mtu", with(sys0 + "/mtu", -1500), "MTU -1500 is out of range (1280-9000)"},
+      {"name with a newline", with(at("pnic", "pnic5") + "/name", "pnic5\nx"),
        "field \"name\": Pnic name contains a control character (byte 6)"},
-      {"policy incomplete",
-       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"].erase("maxActive"); }),
+      {"policy incomplete", with(sys0 + "/policy/maxActive", {}),
        "field \"policy\": maxActive is missing"},
-      {"policy negative",
-       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"]["maxActive"] = -5; }),
-       "Invalid max active uplinks -5"},
-      {"policy repeats a pnic", changed([&](Json& t) {
-         row(t, "vswitch", "name", "sys0")["policy"]["uplinkOrder"] = {"pnic4", "pnic4"};
-       }),
+      {"policy negative", with(sys0 + "/policy/maxActive", -5), "Invalid max active uplinks -5"},
+      {"policy repeats a pnic", with(sys0 + "/policy/uplinkOrder", Json::array({"pnic4", "pnic4"})),
        "Uplink pnic4 appears twice in the teaming order"},
-      {"duplicate row",
-       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic4"; }),
+      {"duplicate row", with(at("pnic", "pnic5") + "/name", "pnic4"),
        "repeats the key of an earlier row"},
-      {"opaque repeats a pnic", changed([&](Json& t) {
-         row(t, "opaque", "name", "opq0")["uplinks"] = {"pnic4", "pnic4"};
-       }),
+      {"opaque repeats a pnic",
+       with(at("opaque", "opq0") + "/uplinks", Json::array({"pnic4", "pnic4"})),
        "names pnic4 twice"},
-      {"opaque overused",
-       changed([&](Json& t) { row(t, "opaque", "name", "opq0")["used_ports"] = 100; }),
+      {"opaque overused", with(at("opaque", "opq0") + "/used_ports", 100),
        "Invalid number of used ports 100 (0-32)"},
-      {"unknown fault operation",
-       changed([&](Json& t) { t["fault"][0]["operation"] = "SetVlanID"; }),
+      {"unknown fault operation", with("/tables/fault/0/operation", "SetVlanID"),
        "Unknown operation SetVlanID"},
-      {"counter zero", changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "0"; }),
+      {"counter zero", with(nextSeq, "0"), "\"next_seq\" must be a number from 1 to"},
+      {"counter at the end", with(nextSeq, "9223372036854775807"),
        "\"next_seq\" must be a number from 1 to"},
-      {"counter at the end", changed([&](Json& t) {
-         row(t, "meta", "key", "next_seq")["value"] = "9223372036854775807";
-       }),
-       "\"next_seq\" must be a number from 1 to"},
-      {"counter behind",
-       changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "3"; }),
-       "is not beyond the largest seq"},
+      {"counter behind", with(nextSeq, "3"), "is not beyond the largest seq"},
   };
   for (const auto& c : cases) {
     const std::string message = Refusal([&] { host.Load(c.text); });
