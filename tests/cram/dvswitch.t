@@ -2,7 +2,6 @@ Distributed switches: creation parameters, DVPort uplinks, the DVPort test event
 
   $ . "$TESTDIR/setup.sh"
   $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
 
 By default the UUID comes from the name, and the switch is a version 6 cswitch.
 

@@ -2,7 +2,6 @@ Restore: switches (-r), and the uplinks of every standard switch (-R).
 
   $ . "$TESTDIR/setup.sh"
   $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
 
 A configured host comes back exactly as it was after a reboot and -r, -R,
 in its listing and in all that tarnhost shows of the running state; a

@@ -2,3 +2,6 @@
 # own in its scratch directory, and no library tracing.
 export TARN_HOST_DB="$PWD/host.db"
 unset TARN_TRACE
+# The trace's lines of the calls matching the pattern $1 since the last
+# look (status 1 when none), for transcripts that turn the trace on.
+calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }

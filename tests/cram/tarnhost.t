@@ -33,11 +33,9 @@ also with -h or --help after them (which wins over mistakes, but not over
     Its name is 1 to 31 bytes and unique.
   $ tarnhost fault --help | cmp - <(tarnhost help fault) && tarnhost -h timeout uplink | tail -1
     Also spelled: timeout uplink.
-  $ for args in 'pnic -h' 'show -h' 'dvs add --help' 'init --full -h' 'timeout add -h' \
-  >     'timeout lag 1 -h' 'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
+  $ for args in 'dvs add --help' 'init --full -h' 'timeout add -h' 'timeout lag 1 -h' \
+  >     'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
   >   brief $args | cut -d'|' -f1-2; done
-  0 usage: tarnhost pnic add ...|       tarnhost pnic del ...
-  0 usage: tarnhost show ...|show: print the host in readable form, as JSON or as a graph
   0 usage: tarnhost dvs add ...|dvs add: add a distributed switch
   0 usage: tarnhost init ...|init: reset the host to the default host, or to an empty one
   0 usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...

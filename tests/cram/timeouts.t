@@ -2,7 +2,6 @@ Uplink and LAG timeouts: loaded, and printed as portset,uplink,lagid,timeout.
 
   $ . "$TESTDIR/setup.sh"
   $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
   $ tarnhost dvs add dvs9
   created a new default host at */host.db (glob)
   $ tarnhost timeout uplink vswitch0 uplink1 1 1

@@ -35,7 +35,6 @@ TEST(OperationsTest, OneEntryPerNameInNameOrder) {
     std::istringstream names{std::string(list.operations)};
     for (std::string name; names >> name;) EXPECT_NE(FindOperation(name), nullptr) << name;
   }
-  EXPECT_FALSE(FindOperation("TARN_ReturnStatusToString")->faultable);
   EXPECT_EQ(FindOperation("SetTeamingPolicy")->targets, kStandardSwitch | kPortGroup);
   EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
 }

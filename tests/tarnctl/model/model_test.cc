@@ -36,7 +36,6 @@ TEST_F(ModelTest, NamesAreShortPrintableTextWithoutCommasWhereListed) {
     std::string name;
     std::string refusal;
   } cases[] = {
-      {NameKind::kSwitch, "vs1", ""},
       {NameKind::kSwitch, std::string(31, 's'), ""},
       {NameKind::kSwitch, std::string(32, 's'),
        "Rule: Virtual switch name " + std::string(32, 's') + " is too long (at most 31 bytes)"},
