@@ -116,10 +116,8 @@ One command per run, before any option with a bit; modifiers need it earlier:
   $ while read -r args; do eval "set -- $args"; run "$@"; done <<'EOF'
   > -a -a -h
   > -a -a vs1
-  > -l -c
   > -B down -b vs0
   > -y -a vs1
-  > --portset=ps --get-lacp-timeout
   > -a -y -z -Y -f -m 1500 vs1
   > --dvswitch vs1
   > --uuid=xyz vs1
@@ -133,8 +131,6 @@ One command per run, before any option with a bit; modifiers need it earlier:
   > -Y --fast-switch vs1
   > -S -l
   > EOF
-  1 (usage): Error, only one command can be performed at a time.
-  1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, only one command can be performed at a time.
