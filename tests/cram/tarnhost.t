@@ -115,50 +115,13 @@ The default host as a dump.
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
 
 Refusals of the host: "tarnhost: " and the reason with its explanation,
-status 1, nothing changed.
+status 1, nothing changed (each refusal's words: the admin test).
 
   $ tarnhost dump > before.json
-  $ while read -r args; do eval "set -- $args"; refused tarnhost "$@" < /dev/null; done <<'EOF' | paste -d' ' - -
-  > pnic add pnic0
-  > client add nosuch vm1
-  > dvs add d1 --uplinks pnic0
-  > dvs add d1 --uplinks pnic9
-  > dvs add d1 --mtu 1279
-  > dvs add 0123456789012345678901234567890123
-  > dvport add nosuch 10
-  > opaque add o1 --ports 16 --used 17
-  > timeout uplink vs0 u1 1 256
-  > fault add GetName --times 0
-  > fault add ''
-  > pnic del pnic0
-  > pnic del pnic9
-  > client del Management vm9
-  > system-switch del vswitch0
-  > dvs del d9
-  > dvport del d9 1
-  > opaque del o9
-  > timeout del lag vs0 1
-  > fault del 1
-  > EOF
+  $ for args in 'pnic add pnic0' 'system-switch del vswitch0' 'fault del 1'; do
+  >   refused tarnhost $args; done | paste -d' ' - -
   status 1 tarnhost: Pnic pnic0 already exists
-  status 1 tarnhost: Portgroup nosuch does not exist
-  status 1 tarnhost: pnic0 is already linked to vswitch0
-  status 1 tarnhost: Uplink pnic9 does not exist on this host
-  status 1 tarnhost: MTU 1279 is out of range (1280-9000)
-  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
-  status 1 tarnhost: DVS nosuch does not exist
-  status 1 tarnhost: Invalid number of used ports 17 (0-16)
-  status 1 tarnhost: Invalid timeout 256 (0-255)
-  status 1 tarnhost: Invalid times 0 (it must be 1 or more)
-  status 1 tarnhost: Fault operation is empty
-  status 1 tarnhost: Pnic pnic0 is linked to vswitch0
-  status 1 tarnhost: Pnic pnic9 does not exist
-  status 1 tarnhost: Client vm9 is not on portgroup Management
   status 1 tarnhost: Virtual switch vswitch0 is not a system switch (orvocfg-vswitch -d removes it)
-  status 1 tarnhost: DVS d9 does not exist
-  status 1 tarnhost: DVPort 1 does not exist on d9
-  status 1 tarnhost: Opaque switch o9 does not exist
-  status 1 tarnhost: No LAG timeout for vs0, LAG 1 is stored
   status 1 tarnhost: Fault 1 does not exist (tarnhost fault list numbers the armed ones)
   $ tarnhost dump | cmp - before.json
 
