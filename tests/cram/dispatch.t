@@ -1,9 +1,6 @@
 Argument checks and the dispatch chain of orvocfg-vswitch.
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
-  $ export TARN_TRACE=$PWD/trace
+  $ . "$TESTDIR/setup.sh" init trace
 
 Usage errors (no option; ENS on and off at once) leave the host untouched.
 

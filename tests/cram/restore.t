@@ -1,7 +1,6 @@
 Restore: switches (-r), and the uplinks of every standard switch (-R).
 
-  $ . "$TESTDIR/setup.sh"
-  $ export TARN_TRACE=$PWD/trace
+  $ . "$TESTDIR/setup.sh" trace
 
 A configured host comes back exactly as it was after a reboot and -r, -R,
 in its listing and in all that tarnhost shows of the running state; a

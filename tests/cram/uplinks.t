@@ -1,8 +1,6 @@
 Uplinks of a standard switch and of its port groups (-L, -U, -M, -N).
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
+  $ . "$TESTDIR/setup.sh" init
   $ for p in pnic4 pnic5 pnic6; do tarnhost pnic add $p; done
   $ order() { orvocfg-vswitch -l | awk -v sw="$1" '$1 == sw {print $NF}'; orvocfg-vswitch -x "$1"; }
 
