@@ -70,7 +70,6 @@ TEST_F(FaultTest, ATargetMatchesTheObjectOrTheNameArgument) {
   };
   auto dvsMtu = [] { Dvs("dvs0")->GetMTU(); };
   const std::vector<Case> cases = {
-      {Fault("SetVlanId", "pg1"), [] { PortGroupImpl("pg2").SetVlanId(1); }, "P"},
       {Fault("GetMTU", "vs1"), dvsMtu, "P"},
       {Fault("GetMTU", "dvs0"), dvsMtu, "F"},
       {Fault("GetMTU", "dvs0-ps"), dvsMtu, "F"},

@@ -95,7 +95,6 @@ TEST_F(ModelTest, InvariantsFindTheFirstOffender) {
     const char* sql;
     const char* violation;
   } cases[] = {
-      {"", ""},
       {"UPDATE portgroup SET switch = 'gone' WHERE layer = 0",
        "port group Management belongs to switch gone, which does not exist in the stored "
        "configuration"},
