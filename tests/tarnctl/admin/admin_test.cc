@@ -1,16 +1,8 @@
 // The administration of the simulated host: seeding refusals, and the dump
 // that must reproduce a host exactly and refuse any faulty document
 // without touching the host.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
-#include <functional>
-#include <string>
-
 #include <nlohmann/json.hpp>
 #include "host_fixture.h"
-#include "hostctl/exception.h"
-#include "tarnctl/admin/host.h"
 
 namespace {
 
@@ -18,9 +10,7 @@ using TarnCtl::Admin::Host;
 
 class AdminTest : public HostTest {
  protected:
-  void UseDatabase(const std::string& name) {
-    setenv("TARN_HOST_DB", (dir_ + "/" + name).c_str(), 1);
-  }
+  void UseDatabase(const std::string& name) { setenv("TARN_HOST_DB", Path(name).c_str(), 1); }
 
   // A host with something in every table the administration can fill.
   static void Seed(Host& host) {

@@ -21,12 +21,8 @@ FaultSeed Fault(const char* operation, std::optional<std::string> on = std::null
 
 // "P" when `call` passes, "F" when the armed fault fails it.
 std::string Outcome(const std::function<void()>& call) {
-  try {
-    call();
-    return "P";
-  } catch (const HostCtl::Lib::HostCtlException& e) {
-    return e.GetMessage() == "armed" ? "F" : "?" + e.GetMessage();
-  }
+  const std::string message = Refusal(call);
+  return message.empty() ? "P" : message == "armed" ? "F" : "?" + message;
 }
 
 TEST_F(FaultTest, SkipAndTimesCountDown) {
