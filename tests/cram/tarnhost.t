@@ -108,16 +108,13 @@ exactly, the commands and options of the table as the usage shows it.
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
   36 commands, 20 options compared
 
-The default host as a dump.
+The default host as a dump; refusals of the host: "tarnhost: " and the
+reason with its explanation, status 1, nothing changed (each refusal's
+words: the admin test).
 
-  $ tarnhost dump | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
+  $ tarnhost dump | tee before.json | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
   created a new default host at */host.db (glob)
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
-
-Refusals of the host: "tarnhost: " and the reason with its explanation,
-status 1, nothing changed (each refusal's words: the admin test).
-
-  $ tarnhost dump > before.json
   $ for args in 'pnic add pnic0' 'system-switch del vswitch0' 'fault del 1'; do
   >   refused tarnhost $args; done | paste -d' ' - -
   status 1 tarnhost: Pnic pnic0 already exists
