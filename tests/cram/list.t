@@ -66,8 +66,7 @@ A distributed switch: rows show the switch name, error lines the portset name.
     102                                     0           $
   $
   $ tarnhost fault add IsInUse --on 101 --message 'port unreadable'
-  $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/' | sed -n 5,7p
-    100                                     1           client-a    $
+  $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/' | sed -n 6,7p
     101                                     Listing failed for DVPort: 101 under DVSwitch: ps-dvs0, Error: port unreadable$
     102                                     0           $
 
@@ -95,8 +94,7 @@ Opaque switches: one row, failures end the block.
   opaque1          64          0                     $
   $
   $ tarnhost fault add GetUsedPorts --on ps-op0 --message 'count unreadable'
-  $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/' | sed -n 1,3p
-  Switch Name      Num Ports   Used Ports  Uplinks   $
+  $ orvocfg-vswitch -l 2>&1 | sed 's/$/$/' | sed -n 2,3p
   opaque0          512         Listing failed for opaque switch: ps-op0, Error: count unreadable$
   Switch Name      Num Ports   Used Ports  Uplinks   $
 

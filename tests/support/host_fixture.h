@@ -24,15 +24,12 @@ class HostTest : public ScratchTest {
   void SetUp() override {
     ScratchTest::SetUp();
     path_ = Path("host.db");
+    for (const char* name : {"TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
     setenv("TARN_HOST_DB", path_.c_str(), 1);
-    unsetenv("TARN_TRACE");
-    unsetenv("TARN_LOCK_TIMEOUT");
   }
 
   void TearDown() override {
-    unsetenv("TARN_HOST_DB");
-    unsetenv("TARN_TRACE");
-    unsetenv("TARN_LOCK_TIMEOUT");
+    for (const char* name : {"TARN_HOST_DB", "TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
     ScratchTest::TearDown();
   }
 
