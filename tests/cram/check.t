@@ -1,10 +1,7 @@
 Existence checks (-c, -C): "1" or "0", status 0 either way.
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
+  $ . "$TESTDIR/setup.sh" init trace
   $ tarnhost dvs add dvs0
-  $ export TARN_TRACE=$PWD/trace
 
 A distributed switch answers the lookup; SwitchExists is not asked then.
 

@@ -1,20 +1,15 @@
 Distributed switches: creation parameters, DVPort uplinks, the DVPort test event.
 
-  $ . "$TESTDIR/setup.sh"
-  $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ . "$TESTDIR/setup.sh" trace
 
-By default the UUID comes from the name, and the switch is a version 6 cswitch.
+By default the UUID comes from the name, and the switch is a version 6
+cswitch; a given UUID is passed as typed.
 
-  $ orvocfg-vswitch -a --dvswitch dvs0:64
+  $ orvocfg-vswitch -a --dvswitch dvs0:64 &&
+  > orvocfg-vswitch -a --dvswitch --uuid=0011223344556677-8899AABBCCDDEEFF dvs1
   created a new default host at */host.db (glob)
   $ calls AddDVSwitch
   AddDVSwitch("64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00", "dvs0", "cswitch", "dvs0", 64, 6, 0)
-
-A given UUID is passed as typed.
-
-  $ orvocfg-vswitch -a --dvswitch --uuid=0011223344556677-8899AABBCCDDEEFF dvs1
-  $ calls AddDVSwitch
   AddDVSwitch("0011223344556677-8899AABBCCDDEEFF", "dvs1", "cswitch", "dvs1", 128, 6, 0)
 
 Class and version from what was given (version in base 10, cut to 32 bits):

@@ -1,8 +1,6 @@
 ENS: the activation node, activation, deactivation and reassociation.
 
-  $ . "$TESTDIR/setup.sh"
-  $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ . "$TESTDIR/setup.sh" trace
   $ ens='NODI_[A-Za-z]*|GetIntParamList|ActivateEns|DeactivateEns|GetEnsMode|ReassociateEnsUplinks'
 
 -y sets the node, then activates ENS with the two modifier flags.

@@ -1,9 +1,7 @@
 Forced reassociation signals the device manager named by its fixed PID file,
 which this test owns while it runs and leaves nothing behind.
 
-  $ . "$TESTDIR/setup.sh"
-  $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ . "$TESTDIR/setup.sh" trace
   $ dir=/var/run/halden pidfile=/var/run/halden/tarndevmgr.pid made= pid=
   $ if [ -e "$pidfile" ]; then exit 80; fi
   $ cleanup() {

@@ -1,8 +1,6 @@
 Port groups of a standard switch (-A, -D, -v with -p).
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
+  $ . "$TESTDIR/setup.sh" init
   $ vlans() { orvocfg-vswitch -l | awk '/^  [A-Za-z]/ && $1 != "PortGroup" {print $1, $2}'; }
 
 The last of -A and -p names the port group; "ALL" is an ordinary name here.
@@ -73,5 +71,3 @@ switch name) are refused, and the trace stays one line per call.
   $ grep -cv '^[A-Za-z:]*(' trace
   0
   [1]
-  $ grep AddPortGroup trace
-  AddPortGroup("pg\nRemovePortGroup(\"Management\") on vswitch0") on vswitch0

@@ -1,8 +1,6 @@
 Active uplink count and discovery status (-X, -x, -B, -b).
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
+  $ . "$TESTDIR/setup.sh" init
 
   $ orvocfg-vswitch -x vswitch0
   1

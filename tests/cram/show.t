@@ -47,8 +47,7 @@ its switches restored without their links, and a dump edited so that the layers 
 
 JSON: the layers by name, words for codes, texts that are not UTF-8 in hex.
 
-  $ jq -c 'keys_unsorted, (.running, .stored | keys_unsorted)' host.json
-  ["host","pnics","running","stored","opaqueSwitches","dvports","events","faults"]
+  $ jq -c '.running, .stored | keys_unsorted' host.json
   ["standardSwitches","distributedSwitches","ens","uplinkTimeouts","lagTimeouts"]
   ["standardSwitches","distributedSwitches","uplinkTimeouts","lagTimeouts"]
   $ tarnhost show --json dvs0 | jq -c '.distributedSwitch | .running, .stored.uplinks, .dvports'

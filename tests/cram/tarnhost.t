@@ -13,57 +13,29 @@ standard output with status 0; without a command it is bad usage.
   $ tarnhost -h | cmp - help && tarnhost --help | cmp - help
   $ tarnhost 2>&1 >/dev/null | tail -n +2 | cmp - help; tarnhost 2>&1 | head -1
   tarnhost: no command given
-  $ sed -n '1,12p;/system-switch add/,+1p;/^  help/,$p' help
+  $ sed -n '1p;5p;/system-switch add/,+1p;$p' help
   usage: tarnhost COMMAND [ARGUMENTS]
-  Administers the simulated host: the host file named by TARN_HOST_DB, or the
-  default location; see 'tarnhost path'.
-  
     init [--empty]                reset the host to the default host, or to an empty one
-    show [NAME] [--json] [--dot]  print the host in readable form, as JSON or as a graph
-    dump                          write the whole host as JSON on standard output
-    load FILE                     replace the host with a dump (FILE - : standard input)
-    reboot                        drop the running state, keep the stored configuration
-    path                          print the path of the host file
-    pnic add NAME                 add a physical NIC
-    pnic del NAME                 remove a physical NIC
     system-switch add NAME [--ports N]
                                   add a system switch
-    help [COMMAND...]             print this text, or the help of COMMAND
-    --version                     print tarnhost's version
-  
-  'tarnhost help COMMAND' or 'tarnhost COMMAND --help' prints the help of a
-  command. Numbers are decimal. Options take their value as --opt VALUE or
-  --opt=VALUE; "--" ends the options. Exit status: 0 success, 1 refused by the
   host, 2 bad usage.
 
 Help at every level: that of the commands that begin with the words given,
 also with -h or --help after them (which wins over mistakes, but not over
 "--" or an option's value).
 
-  $ tarnhost help pnic
+  $ tarnhost help pnic | head -6
   usage: tarnhost pnic add NAME
          tarnhost pnic del NAME
          tarnhost pnic list
   
   pnic add: add a physical NIC
     Its name is 1 to 31 bytes and unique.
-  
-  pnic del: remove a physical NIC
-    Refused while a switch of the running state uses it, and while the stored
-    configuration or the distributed switch cache links it: a restore would link
-    it again.
-  
-  pnic list: list the physical NICs
-    A line for each: its name, the running switch that uses it, and the switch
-    that links it in the stored configuration or the cache. Fields are separated
-    by a tab and lists within a field by commas; an empty field is none.
   $ tarnhost fault --help | cmp - <(tarnhost help fault) && tarnhost -h timeout uplink | tail -1
     Also spelled: timeout uplink.
-  $ for args in 'pnic -h' 'show -h' 'dvs add --help' 'init --full -h' 'timeout add -h' \
-  >     'timeout lag 1 -h' 'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
+  $ for args in 'dvs add --help' 'init --full -h' 'timeout add -h' 'timeout lag 1 -h' \
+  >     'help help' 'fault add -- -h x' 'dvs add d1 --mtu -h'; do
   >   brief $args | cut -d'|' -f1-2; done
-  0 usage: tarnhost pnic add ...|       tarnhost pnic del ...
-  0 usage: tarnhost show ...|show: print the host in readable form, as JSON or as a graph
   0 usage: tarnhost dvs add ...|dvs add: add a distributed switch
   0 usage: tarnhost init ...|init: reset the host to the default host, or to an empty one
   0 usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
@@ -136,63 +108,17 @@ exactly, the commands and options of the table as the usage shows it.
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
   36 commands, 20 options compared
 
-The default host as a dump.
+The default host as a dump; refusals of the host: "tarnhost: " and the
+reason with its explanation, status 1, nothing changed (each refusal's
+words: the admin test).
 
-  $ tarnhost dump | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
+  $ tarnhost dump | tee before.json | python3 -c 'import json, sys; d = json.load(sys.stdin); print(d["format"], d["version"], *(f"{k}:{len(v)}" for k, v in d["tables"].items() if v))'
   created a new default host at */host.db (glob)
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
-
-Refusals of the host: "tarnhost: " and the reason with its explanation,
-status 1, nothing changed.
-
-  $ tarnhost dump > before.json
-  $ while read -r args; do eval "set -- $args"; refused tarnhost "$@" < /dev/null; done <<'EOF' | paste -d' ' - -
-  > pnic add pnic0
-  > client add nosuch vm1
-  > system-switch add vswitch0
-  > system-switch add s1 --ports 4097
-  > dvs add d1 --uplinks pnic0
-  > dvs add d1 --uplinks pnic9
-  > dvs add d1 --mtu 1279
-  > dvs add 0123456789012345678901234567890123
-  > dvport add nosuch 10
-  > opaque add o1 --ports 16 --used 17
-  > timeout uplink vs0 u1 1 256
-  > fault add GetName --times 0
-  > fault add ''
-  > show --json nosuch
-  > pnic del pnic0
-  > pnic del pnic9
-  > client del Management vm9
-  > system-switch del vswitch0
-  > dvs del d9
-  > dvport del d9 1
-  > opaque del o9
-  > timeout del lag vs0 1
-  > fault del 1
-  > EOF
+  $ for args in 'pnic add pnic0' 'system-switch del vswitch0' 'fault del 1'; do
+  >   refused tarnhost $args; done | paste -d' ' - -
   status 1 tarnhost: Pnic pnic0 already exists
-  status 1 tarnhost: Portgroup nosuch does not exist
-  status 1 tarnhost: Virtual switch vswitch0 already exists on this host
-  status 1 tarnhost: Invalid number of ports 4097 (8-4096)
-  status 1 tarnhost: pnic0 is already linked to vswitch0
-  status 1 tarnhost: Uplink pnic9 does not exist on this host
-  status 1 tarnhost: MTU 1279 is out of range (1280-9000)
-  status 1 tarnhost: Virtual switch name 0123456789012345678901234567890123 is too long (at most 31 bytes)
-  status 1 tarnhost: DVS nosuch does not exist
-  status 1 tarnhost: Invalid number of used ports 17 (0-16)
-  status 1 tarnhost: Invalid timeout 256 (0-255)
-  status 1 tarnhost: Invalid times 0 (it must be 1 or more)
-  status 1 tarnhost: Fault operation is empty
-  status 1 tarnhost: No standard switch, distributed switch or port group is named nosuch in either layer
-  status 1 tarnhost: Pnic pnic0 is linked to vswitch0
-  status 1 tarnhost: Pnic pnic9 does not exist
-  status 1 tarnhost: Client vm9 is not on portgroup Management
   status 1 tarnhost: Virtual switch vswitch0 is not a system switch (orvocfg-vswitch -d removes it)
-  status 1 tarnhost: DVS d9 does not exist
-  status 1 tarnhost: DVPort 1 does not exist on d9
-  status 1 tarnhost: Opaque switch o9 does not exist
-  status 1 tarnhost: No LAG timeout for vs0, LAG 1 is stored
   status 1 tarnhost: Fault 1 does not exist (tarnhost fault list numbers the armed ones)
   $ tarnhost dump | cmp - before.json
 

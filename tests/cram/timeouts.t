@@ -1,17 +1,11 @@
 Uplink and LAG timeouts: loaded, and printed as portset,uplink,lagid,timeout.
 
-  $ . "$TESTDIR/setup.sh"
-  $ export TARN_TRACE=$PWD/trace
-  $ calls() { grep -E "^($1)\(" trace; local found=$?; : > trace; return $found; }
+  $ . "$TESTDIR/setup.sh" trace
   $ tarnhost dvs add dvs9
   created a new default host at */host.db (glob)
-  $ tarnhost timeout uplink vswitch0 uplink1 1 1
-  $ tarnhost timeout uplink vswitch0 uplink2 1 0
-  $ tarnhost timeout uplink vswitch0 uplink1 16 65
-  $ tarnhost timeout uplink dvs9 uplink1 1 255
-  $ tarnhost timeout lag vswitch0 7 1
-  $ tarnhost timeout lag vswitch0 16 65
-  $ tarnhost timeout lag dvs9 7 255
+  $ for t in 'uplink vswitch0 uplink1 1 1' 'uplink vswitch0 uplink2 1 0' \
+  >     'uplink vswitch0 uplink1 16 65' 'uplink dvs9 uplink1 1 255' 'lag vswitch0 7 1' \
+  >     'lag vswitch0 16 65' 'lag dvs9 7 255'; do tarnhost timeout $t; done
   $ : > trace
 
 The modifiers go to the library as given; absent ones as empty text and 0.

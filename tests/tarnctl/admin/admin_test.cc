@@ -1,16 +1,8 @@
 // The administration of the simulated host: seeding refusals, and the dump
 // that must reproduce a host exactly and refuse any faulty document
 // without touching the host.
-#include <gtest/gtest.h>
-#include <stdlib.h>
-
-#include <functional>
-#include <string>
-
 #include <nlohmann/json.hpp>
 #include "host_fixture.h"
-#include "hostctl/exception.h"
-#include "tarnctl/admin/host.h"
 
 namespace {
 
@@ -18,9 +10,7 @@ using TarnCtl::Admin::Host;
 
 class AdminTest : public HostTest {
  protected:
-  void UseDatabase(const std::string& name) {
-    setenv("TARN_HOST_DB", (dir_ + "/" + name).c_str(), 1);
-  }
+  void UseDatabase(const std::string& name) { setenv("TARN_HOST_DB", Path(name).c_str(), 1); }
 
   // A host with something in every table the administration can fill.
   static void Seed(Host& host) {
@@ -93,87 +83,84 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
   }());
 }
 
-// The refusals the tarnhost transcript does not already show.
+// Each refusal of seeding and removal in its words (the detailed message,
+// which tarnhost prints without the operation's name: the tarnhost
+// transcript), but those of the rules that the model and API tests show.
 TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
-  const std::string tooLong(32, 'x');
   auto dvs = [](TarnCtl::Admin::DVSwitchSeed seed) {
     return [seed](Host& h) { h.AddDVSwitch(seed); };
   };
+  auto fault = [](TarnCtl::Admin::FaultSeed seed) { return [seed](Host& h) { h.AddFault(seed); }; };
+  const std::string tooLong = "0123456789012345678901234567890123";
   const struct {
-    const char* what;
     std::function<void(Host&)> call;
-    const char* message;
+    std::string detail;
   } cases[] = {
-      {"pnic empty", [](Host& h) { h.AddPnic(""); }, "Pnic name is empty"},
-      {"pnic long", [&](Host& h) { h.AddPnic(tooLong); }, "is too long"},
-      {"pnic not text", [](Host& h) { h.AddPnic("\xff"); }, "Pnic name is not valid UTF-8 text"},
-      {"pnic comma", [](Host& h) { h.AddPnic("c,d"); }, "Pnic name c,d contains a comma"},
-      {"client twice", [](Host& h) { h.AddClient("Management", "vm1"); },
-       "Client vm1 is already on portgroup Management"},
-      {"client unnamed", [](Host& h) { h.AddClient("Management", ""); }, "Client name is empty"},
-      {"client escape", [](Host& h) { h.AddClient("Management", "\x1b[2J"); },
-       "Client name contains a control character"},
-      {"name of a portset", [](Host& h) { h.AddSystemSwitch("ps0", 64); }, "ps0 already exists"},
-      {"ports low", [](Host& h) { h.AddSystemSwitch("s", 7); }, "Invalid number of ports 7"},
-      {"pnic of a dvs", dvs({"d", {}, {}, 128, 1500, {"pnic1"}}),
-       "pnic1 is already linked to dvs0"},
-      {"pnic of opaque", dvs({"d", {}, {}, 128, 1500, {"pnic3"}}),
-       "pnic3 is already linked to opq0"},
-      {"pnic twice", dvs({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}}),
-       "Uplink pnic4 is given twice"},
-      {"dvs mtu", dvs({"d", {}, {}, 128, 9001, {}}), "MTU 9001 is out of range"},
-      {"dvs id taken", dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
-       "A DVS with id dvs-dvs0 already exists"},
-      {"dvs name taken", dvs({"dvs0", "p9", {}, 128, 1500, {}}), "dvs0 already exists"},
-      {"dvport twice",
-       [](Host& h) {
+      {[&](Host& h) { h.AddPnic(tooLong); },
+       "AddPnic: Pnic name " + tooLong + " is too long (at most 31 bytes)"},
+      {[](Host& h) { h.AddPnic("c,d"); },
+       "AddPnic: Pnic name c,d contains a comma (such names are listed comma-separated)"},
+      {[](Host& h) { h.AddClient("nosuch", "vm1"); }, "AddClient: Portgroup nosuch does not exist"},
+      {[](Host& h) { h.AddClient("Management", "vm1"); },
+       "AddClient: Client vm1 is already on portgroup Management"},
+      {[](Host& h) { h.AddClient("Management", "\x1b[2J"); },
+       "AddClient: Client name contains a control character (byte 1)"},
+      {dvs({"d", {}, {}, 128, 1500, {"pnic0"}}),
+       "AddDVSwitch: pnic0 is already linked to vswitch0"},
+      {dvs({"d", {}, {}, 128, 1500, {"pnic4", "pnic4"}}),
+       "AddDVSwitch: Uplink pnic4 is given twice"},
+      {dvs({"d", {}, {}, 128, 1279, {}}), "AddDVSwitch: MTU 1279 is out of range (1280-9000)"},
+      {dvs({tooLong, {}, {}, 128, 1500, {}}),
+       "AddDVSwitch: Virtual switch name " + tooLong + " is too long (at most 31 bytes)"},
+      {dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
+       "AddDVSwitch: A DVS with id dvs-dvs0 already exists on this host"},
+      {[](Host& h) {
+         h.AddDVPort({"nosuch", "10", {}, 0});
+       },
+       "AddDVPort: DVS nosuch does not exist"},
+      {[](Host& h) {
          h.AddDVPort({"dvs0", "100", {}, 0});
        },
-       "DVPort 100 already exists on dvs0"},
-      {"dvport client twice",
-       [](Host& h) {
+       "AddDVPort: DVPort 100 already exists on dvs0"},
+      {[](Host& h) {
          h.AddDVPort({"dvs0", "7", {"a", "a"}, 0});
        },
-       "Client a is given twice"},
-      {"uplink timeout twice", [](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
-       "already stored"},
-      {"lag timeout unnamed portset", [](Host& h) { h.AddLagTimeout("", 3, 1); },
-       "Portset name is empty"},
-      {"fault negative skip",
-       [](Host& h) {
-         h.AddFault({"GetName", {}, {}, {}, -1, 1});
+       "AddDVPort: Client a is given twice"},
+      {[](Host& h) {
+         h.AddOpaqueSwitch({"o1", {}, 16, 17, {}});
        },
-       "Invalid skip count -1"},
-      {"fault misspelt",
-       [](Host& h) {
-         h.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
-       },
-       "Unknown operation SetVlanID"},
-      {"removing a pnic of opaque", [](Host& h) { h.RemovePnic("pnic3"); }, "linked to opq0"},
-      {"dvs by portset", [](Host& h) { h.RemoveDVSwitch("ps0"); }, "DVS ps0 does not exist"},
-      {"dvport unknown", [](Host& h) { h.RemoveDVPort("dvs0", "102"); },
-       "DVPort 102 does not exist on dvs0"},
-      {"opaque not a dvs", [](Host& h) { h.RemoveOpaqueSwitch("dvs0"); }, "does not exist"},
-      {"client of another port group", [](Host& h) { h.RemoveClient("pg1", "vm1"); },
-       "Client vm1 is not on portgroup pg1"},
-      {"uplink timeout of another LAG",
-       [](Host& h) { h.RemoveUplinkTimeout("vswitch0", "pnic0", 8); },
-       "No uplink timeout for vswitch0, pnic0, LAG 8 is stored"},
-      {"fault unknown", [](Host& h) { h.RemoveFault(3); }, "Fault 3 does not exist"},
+       "AddOpaqueSwitch: Invalid number of used ports 17 (0-16)"},
+      {[](Host& h) { h.AddUplinkTimeout("vs0", "u1", 1, 256); },
+       "AddUplinkTimeout: Invalid timeout 256 (0-255)"},
+      {[](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
+       "AddUplinkTimeout: An uplink timeout for vswitch0, pnic0, LAG 7 is already stored"},
+      {[](Host& h) { h.AddLagTimeout("", 3, 1); }, "AddLagTimeout: Portset name is empty"},
+      {fault({"", {}, {}, {}, 0, 1}), "AddFault: Fault operation is empty"},
+      {fault({"GetName", {}, {}, {}, -1, 1}),
+       "AddFault: Invalid skip count -1 (it must be 0 or more)"},
+      {fault({"GetName", {}, {}, {}, 0, 0}), "AddFault: Invalid times 0 (it must be 1 or more)"},
+      {fault({"SetVlanID", {}, {}, {}, 0, 1}),
+       "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)"},
+      {[](Host& h) { h.RemovePnic("pnic0"); }, "RemovePnic: Pnic pnic0 is linked to vswitch0"},
+      {[](Host& h) { h.RemovePnic("pnic9"); }, "RemovePnic: Pnic pnic9 does not exist"},
+      {[](Host& h) { h.RemoveDVSwitch("ps0"); }, "RemoveDVSwitch: DVS ps0 does not exist"},
+      {[](Host& h) { h.RemoveDVPort("d9", "1"); }, "RemoveDVPort: DVPort 1 does not exist on d9"},
+      {[](Host& h) { h.RemoveOpaqueSwitch("dvs0"); },
+       "RemoveOpaqueSwitch: Opaque switch dvs0 does not exist"},
+      {[](Host& h) { h.RemoveClient("pg1", "vm1"); },
+       "RemoveClient: Client vm1 is not on portgroup pg1"},
+      {[](Host& h) { h.RemoveUplinkTimeout("vswitch0", "pnic0", 8); },
+       "RemoveUplinkTimeout: No uplink timeout for vswitch0, pnic0, LAG 8 is stored"},
+      {[](Host& h) { h.RemoveLagTimeout("vs0", 1); },
+       "RemoveLagTimeout: No LAG timeout for vs0, LAG 1 is stored"},
   };
   Host host;
   Seed(host);
   const std::string before = host.Dump();
   for (const auto& c : cases) {
-    const auto [message, detail] = Refused([&] { c.call(host); });
-    EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
-    EXPECT_TRUE(detail.starts_with("Add") || detail.starts_with("Remove")) << c.what;
-    EXPECT_EQ(host.Dump(), before) << c.what;
+    EXPECT_EQ(Refused([&] { c.call(host); }).second, c.detail);
+    EXPECT_EQ(host.Dump(), before) << c.detail;
   }
-  EXPECT_EQ(Refused([&] {
-              host.AddFault({"SetVlanID", {}, {}, {}, 0, 1});
-            }).second,
-            "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)");
 }
 
 // What seeding adds, removal takes away whole: a distributed switch from
@@ -192,9 +179,6 @@ TEST_F(AdminTest, RemovalUndoesSeeding) {
   host.AddLagTimeout("ps0", 3, 0);
   host.AddFault({"SetVlanId", "pg2", {}, {}, 0, 1});
   host.AddFault({"GetName", {}, "a\tb", {}, 0, 1});
-  EXPECT_EQ(host.List(Listing::kPnics)[4], (TarnCtl::Admin::ListRow{"pnic4", "opq0", ""}));
-  EXPECT_EQ(host.List(Listing::kClients),
-            (std::vector<TarnCtl::Admin::ListRow>{{"Management", "vm1"}}));
   host.RemoveFault(1);
   EXPECT_EQ(host.List(Listing::kFaults),
             (std::vector<TarnCtl::Admin::ListRow>{
@@ -229,34 +213,38 @@ TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {
 }
 
 // Load holds a dump to the rules the library applies: every value, and
-// every invariant across rows. Each faulty dump is refused naming what is
-// wrong, and the host stays as it was.
+// every invariant across rows (their wording: the model test; one through
+// tarnhost: docs/dump.md). Each faulty dump is refused naming what is wrong,
+// and the host stays as it was.
 TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   using Json = nlohmann::ordered_json;
   Host host;
   Seed(host);
   const std::string good = host.Dump();
-  // The dump with `change` made to its document.
-  auto changed = [&](const std::function<void(Json&)>& change) {
-    Json document = Json::parse(good);
-    change(document["tables"]);
-    return document.dump(2);
-  };
-  auto whole = [&](const std::function<void(Json&)>& change) {
-    Json document = Json::parse(good);
-    change(document);
-    return document.dump(2);
-  };
-  auto row = [](Json& tables, const char* table, const char* key,
-                const std::string& value) -> Json& {
-    for (auto& r : tables[table]) {
-      if (r[key] == value) return r;
+  const Json document = Json::parse(good);
+  // The pointer to the first row of `table` with that name (meta's: key).
+  auto at = [&](const std::string& table, const std::string& name) {
+    const Json& rows = document["tables"][table];
+    for (size_t i = 0; i < rows.size(); ++i) {
+      if (rows[i].value("name", rows[i].value("key", "")) == name) {
+        return "/tables/" + table + "/" + std::to_string(i);
+      }
     }
-    throw std::runtime_error(std::string("no row ") + value);
+    throw std::runtime_error("no row " + name);
   };
-  auto client = [](int i) {
-    return Json{{"portgroup", "Management"}, {"name", "c" + std::to_string(i)}};
+  // The dump with `value` put at `pointer`, or what is there removed.
+  auto with = [&](const std::string& pointer, const std::optional<Json>& value) {
+    Json changed = document;
+    const Json::json_pointer where(pointer);
+    if (value) {
+      changed[where] = *value;
+    } else {
+      changed[where.parent_pointer()].erase(where.back());
+    }
+    return changed.dump(2);
   };
+  const std::string sys0 = at("vswitch", "sys0"), management = at("portgroup", "Management");
+  const std::string nextSeq = at("meta", "next_seq") + "/value";
   const struct {
     const char* what;
     std::string text;
@@ -264,70 +252,36 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   } cases[] = {
       {"trailing text", good + "x", "not valid JSON"},
       {"array", "[]", "a dump is a JSON object"},
-      {"version as text", whole([](Json& d) { d["version"] = "1"; }), "must be an integer"},
-      {"version missing", whole([](Json& d) { d.erase("version"); }), "key \"version\" is missing"},
-      {"format wrong", whole([](Json& d) { d["format"] = "other"; }), "\"format\" must be"},
-      {"table unknown", changed([](Json& t) { t["faults"] = Json::array(); }),
-       "unknown table \"faults\""},
-      {"table not an array", changed([](Json& t) { t["ens"] = Json::object(); }),
-       "table \"ens\" must be an array"},
-      {"field missing",
-       changed([&](Json& t) { row(t, "portgroup", "name", "Management").erase("vlan"); }),
+      {"version as text", with("/version", "1"), "must be an integer"},
+      {"version missing", with("/version", {}), "key \"version\" is missing"},
+      {"format wrong", with("/format", "other"), "\"format\" must be"},
+      {"table unknown", with("/tables/faults", Json::array()), "unknown table \"faults\""},
+      {"table not an array", with("/tables/ens", Json::object()), "table \"ens\" must be an array"},
+      {"field missing", with(management + "/vlan", {}),
        "table \"portgroup\", row 1, field \"vlan\": is missing"},
-      {"field unknown", changed([&](Json& t) { row(t, "pnic", "name", "pnic4")["colour"] = 1; }),
-       "unknown field \"colour\""},
-      {"wrong type",
-       changed([&](Json& t) { row(t, "portgroup", "name", "Management")["vlan"] = "0"; }),
-       "must be an integer"},
-      {"vlan", changed([&](Json& t) { row(t, "portgroup", "name", "Management")["vlan"] = 4096; }),
-       "field \"vlan\": VLAN id 4096 is out of range (0-4095)"},
-      {"mtu", changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["mtu"] = -1500; }),
-       "MTU -1500 is out of range (1280-9000)"},
-      {"name with a newline",
-       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic5\nx"; }),
+      {"field unknown", with(at("pnic", "pnic4") + "/colour", 1), "unknown field \"colour\""},
+      {"wrong type", with(management + "/vlan", "0"), "must be an integer"},
+      {"mtu", with(sys0 + "/mtu", -1500), "MTU -1500 is out of range (1280-9000)"},
+      {"name with a newline", with(at("pnic", "pnic5") + "/name", "pnic5\nx"),
        "field \"name\": Pnic name contains a control character (byte 6)"},
-      {"policy incomplete",
-       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"].erase("maxActive"); }),
+      {"policy incomplete", with(sys0 + "/policy/maxActive", {}),
        "field \"policy\": maxActive is missing"},
-      {"policy negative",
-       changed([&](Json& t) { row(t, "vswitch", "name", "sys0")["policy"]["maxActive"] = -5; }),
-       "Invalid max active uplinks -5"},
-      {"policy repeats a pnic", changed([&](Json& t) {
-         row(t, "vswitch", "name", "sys0")["policy"]["uplinkOrder"] = {"pnic4", "pnic4"};
-       }),
+      {"policy negative", with(sys0 + "/policy/maxActive", -5), "Invalid max active uplinks -5"},
+      {"policy repeats a pnic", with(sys0 + "/policy/uplinkOrder", Json::array({"pnic4", "pnic4"})),
        "Uplink pnic4 appears twice in the teaming order"},
-      {"duplicate row",
-       changed([&](Json& t) { row(t, "pnic", "name", "pnic5")["name"] = "pnic4"; }),
+      {"duplicate row", with(at("pnic", "pnic5") + "/name", "pnic4"),
        "repeats the key of an earlier row"},
-      {"opaque repeats a pnic", changed([&](Json& t) {
-         row(t, "opaque", "name", "opq0")["uplinks"] = {"pnic4", "pnic4"};
-       }),
+      {"opaque repeats a pnic",
+       with(at("opaque", "opq0") + "/uplinks", Json::array({"pnic4", "pnic4"})),
        "names pnic4 twice"},
-      {"opaque takes a linked pnic",
-       changed([&](Json& t) { row(t, "opaque", "name", "opq0")["uplinks"] = {"pnic0"}; }),
-       "pnic pnic0 is used by two switches of the running state"},
-      {"opaque overused",
-       changed([&](Json& t) { row(t, "opaque", "name", "opq0")["used_ports"] = 100; }),
+      {"opaque overused", with(at("opaque", "opq0") + "/used_ports", 100),
        "Invalid number of used ports 100 (0-32)"},
-      {"switch overfull", changed([&](Json& t) {
-         for (int i = 0; i < 200; ++i) t["client"].push_back(client(i));
-       }),
-       "switch vswitch0 has 203 ports in use but only 128 ports"},
-      {"dangling port group",
-       changed([&](Json& t) { row(t, "portgroup", "name", "Management")["switch"] = "gone"; }),
-       "belongs to switch gone"},
-      {"unknown fault operation",
-       changed([&](Json& t) { t["fault"][0]["operation"] = "SetVlanID"; }),
+      {"unknown fault operation", with("/tables/fault/0/operation", "SetVlanID"),
        "Unknown operation SetVlanID"},
-      {"counter zero", changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "0"; }),
+      {"counter zero", with(nextSeq, "0"), "\"next_seq\" must be a number from 1 to"},
+      {"counter at the end", with(nextSeq, "9223372036854775807"),
        "\"next_seq\" must be a number from 1 to"},
-      {"counter at the end", changed([&](Json& t) {
-         row(t, "meta", "key", "next_seq")["value"] = "9223372036854775807";
-       }),
-       "\"next_seq\" must be a number from 1 to"},
-      {"counter behind",
-       changed([&](Json& t) { row(t, "meta", "key", "next_seq")["value"] = "3"; }),
-       "is not beyond the largest seq"},
+      {"counter behind", with(nextSeq, "3"), "is not beyond the largest seq"},
   };
   for (const auto& c : cases) {
     const std::string message = Refusal([&] { host.Load(c.text); });

@@ -1,23 +1,12 @@
 // The two layers of the host: changes reach the stored configuration as
 // well as the running state (except where an operation says otherwise), a
-// reboot drops the running state, and the restore operations bring it back.
+// reboot drops the running state, and the restore operations bring it back
+// (all of it, through the tool: the restore transcript).
 #include "host_fixture.h"
 
 namespace {
 
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
-
 using LayersTest = HostTest;
-
-// The running state, as the administration shows it.
-std::string Running() {
-  const std::string shown = TarnCtl::Admin::Host().Show();
-  const auto from = shown.find("Running state");
-  return shown.substr(from, shown.find("Stored configuration") - from);
-}
 
 void RestoreAll() {
   NetworkInfoImpl network;
@@ -26,37 +15,6 @@ void RestoreAll() {
   info->Refresh();
   info->RestoreVirtualSwitches();
   for (const auto& sw : info->GetVirtualSwitches(false)) sw->RestoreUplinks();
-}
-
-TEST_F(LayersTest, RebootThenRestoreGivesBackTheRunningState) {
-  SeedSampleHost();
-  {
-    NetworkInfoImpl network;
-    auto info = network.GetVirtualSwitchInfo();
-    auto vs2 =
-        info->AddVirtualSwitch(HN::NicTeamingPolicy::GetDefaultPolicy(), {}, {}, {}, "vs2", 256);
-    vs2->AddUplink("pnic4", true);
-    vs2->SetMTU(9000);
-    vs2->SetCdpStatus(3);
-    auto policy = vs2->GetTeamingPolicy();
-    policy.SetUplinkOrder({"pnic4", "pnic9"});
-    policy.SetMaxActiveUplinks(1);
-    vs2->SetTeamingPolicy(policy);
-    vs2->AddPortGroup("pgA")->SetVlanId(10);
-    PortGroupImpl("pg2").SetTeamingPolicy(policy);
-    auto dvs = info->AddDVSwitch("00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 07", "dvs7",
-                                 "etherswitch", "dvs7", 32, 5, 0);
-    dvs->SetMTU(1600);
-  }
-  const std::string before = Running();
-  Reboot();
-  EXPECT_NE(Running(), before);
-  EXPECT_THROW(Switch("vs1"), HostCtl::Lib::HostCtlException);
-  RestoreAll();
-  EXPECT_EQ(Running(), before);
-  // A second restore finds nothing missing.
-  RestoreAll();
-  EXPECT_EQ(Running(), before);
 }
 
 TEST_F(LayersTest, UplinkChangesReachTheLayersTheyName) {
@@ -128,7 +86,6 @@ TEST_F(LayersTest, DistributedSwitchesLiveInTheCache) {
   auto dvs = NetworkFactory::GetDVSwitchByName("dvs0");
   EXPECT_EQ(dvs->GetUplinks(), std::vector<std::string>{"pnic2"});
   EXPECT_EQ(dvs->GetUsedPorts(), 2u);  // one uplink, one DVPort with a client
-  EXPECT_EQ(Refusal([&] { info->RemoveVirtualSwitch("dvs0"); }), "DVS dvs0 has 1 ports in use");
 
   info->AddDVSwitch("00 00 00 00 00 00 00 00-00 00 00 00 00 00 00 09", "dvs9", "cswitch", "dvs9",
                     64, 6, 0);

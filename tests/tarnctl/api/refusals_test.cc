@@ -1,17 +1,11 @@
 // The platform's refusals, through the interface the tool uses: each one a
 // HostCtlException with a short message and a detailed message that starts
-// with the operation's name, and none of them changes the host.
+// with the operation's name, and none of them changes the host. Each
+// operation shows that it applies its rules; the rules' bounds and wording
+// are the model test's.
 #include "host_fixture.h"
-#include "hostctl/nodi.h"
 
 namespace {
-
-namespace HN = HostCtl::Network;
-using HN::NetworkFactory;
-using TarnCtl::Network::DVPortImpl;
-using TarnCtl::Network::NetworkInfoImpl;
-using TarnCtl::Network::PortGroupImpl;
-using TarnCtl::Network::VirtualSwitchImpl;
 
 using RefusalTest = HostTest;
 
@@ -55,10 +49,8 @@ TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
        "Virtual switch dvs0-ps already exists"},
       {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "op0", 64); },
        "Virtual switch op0 already exists"},
-      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "", 64); }, "Virtual switch name is empty"},
       {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, std::string(32, 'x'), 64); },
        "Virtual switch name " + std::string(32, 'x') + " is too long"},
-      {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 7); }, "Invalid number of ports 7"},
       {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 4097); },
        "Invalid number of ports 4097"},
       {"AddVirtualSwitch", [](auto& i) { AddSwitch(i, "sw", 64, Policy({"pnic4"}, -1)); },
@@ -81,8 +73,6 @@ TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
        "Portgroup pg1 has 2 ports in use"},
       {"RemovePortGroup", [](auto&) { Switch("vswitch0")->RemovePortGroup("pg2"); },
        "Portgroup pg2 does not exist"},
-      {"AddPortGroup", [](auto&) { Switch("vswitch0")->AddPortGroup(""); },
-       "Portgroup name is empty"},
       {"AddPortGroup", [](auto&) { Switch("vswitch0")->AddPortGroup(std::string(128, 'p')); },
        "Portgroup name " + std::string(128, 'p') + " is too long"},
       {"SetVlanId", [](auto&) { PortGroupImpl("pg2").SetVlanId(4096); },
@@ -99,17 +89,9 @@ TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
        "pnic3 is already linked to op0"},
       {"RemoveUplink", [](auto&) { Switch("vs1")->RemoveUplink("pnic0", false); },
        "pnic0 is not linked to vs1"},
-      {"RemoveUplink", [](auto&) { Switch("vs1")->RemoveUplink("pnic4", true); },
-       "pnic4 is not linked to vs1"},
       {"SetMTU", [](auto&) { Switch("vs1")->SetMTU(1279); }, "MTU 1279 is out of range"},
-      {"SetMTU", [](auto&) { Switch("vs1")->SetMTU(9001); }, "MTU 9001 is out of range"},
       {"SetMTU", [](auto&) { Dvs("dvs0")->SetMTU(100); }, "MTU 100 is out of range"},
       {"SetCdpStatus", [](auto&) { Switch("vs1")->SetCdpStatus(4); }, "Invalid CDP status 4"},
-      {"SetCdpStatus", [](auto&) { Switch("vs1")->SetCdpStatus(-1); }, "Invalid CDP status -1"},
-      {"ParseCdpStatus", [](auto&) { VirtualSwitchImpl::ParseCdpStatus("Both"); },
-       "Unknown CDP status Both"},
-      {"SetMaxActiveUplinks", [](auto&) { HN::NicTeamingPolicy().SetMaxActiveUplinks(-1); },
-       "Invalid max active uplinks -1"},
       {"SetTeamingPolicy",
        [](auto&) {
          Switch("vs1")->SetTeamingPolicy(Policy({"a", "b", "a"}, 1));
@@ -117,7 +99,6 @@ TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
        "Uplink a appears twice in the teaming order"},
       {"SetTeamingPolicy", [](auto&) { PortGroupImpl("pg1").SetTeamingPolicy(Policy({}, -1)); },
        "Invalid max active uplinks -1"},
-      {"GetVirtualSwitchById", [](auto&) { Switch("dvs0"); }, "Virtual switch dvs0 does not exist"},
       {"GetPortsetById", [](auto&) { NetworkFactory::GetPortsetById("dvs0"); },
        "Portset dvs0 does not exist"},
       {"GetDVSwitchByName", [](auto&) { Dvs("vs1"); }, "DVS vs1 does not exist"},

@@ -1,15 +1,8 @@
 // The operation registry, and the trace's refusal to hang or die on a bad
 // trace file.
-#include <fcntl.h>
-#include <gtest/gtest.h>
-#include <stdlib.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
-#include <filesystem>
-#include <fstream>
-#include <sstream>
-
+#include "scratch.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/operations.h"
 #include "tarnctl/instrument/trace.h"
@@ -42,7 +35,6 @@ TEST(OperationsTest, OneEntryPerNameInNameOrder) {
     std::istringstream names{std::string(list.operations)};
     for (std::string name; names >> name;) EXPECT_NE(FindOperation(name), nullptr) << name;
   }
-  EXPECT_FALSE(FindOperation("TARN_ReturnStatusToString")->faultable);
   EXPECT_EQ(FindOperation("SetTeamingPolicy")->targets, kStandardSwitch | kPortGroup);
   EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
 }
@@ -57,14 +49,13 @@ TEST(OperationsTest, AnOperationIsTheFunctionItIsWrittenIn) {
   static_assert(!IsFunction("void X::ResetVlanId(int)", "SetVlanId"));
 }
 
+using TraceTest = ScratchTest;
+
 // A trace file that cannot be opened or written turns the trace off, with
 // a line on standard error, and never blocks: a FIFO without a reader.
-TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
-  char pattern[] = "/tmp/trace-test-XXXXXX";
-  ASSERT_NE(mkdtemp(pattern), nullptr);
-  const std::string fifo = std::string(pattern) + "/fifo";
-  ASSERT_EQ(mkfifo(fifo.c_str(), 0644), 0);
-  for (const std::string& path : {fifo, std::string(pattern), std::string("/dev/full")}) {
+TEST_F(TraceTest, ABadTraceFileTurnsTheTraceOff) {
+  ASSERT_EQ(mkfifo(Path("fifo").c_str(), 0644), 0);
+  for (const std::string& path : {Path("fifo"), dir_, std::string("/dev/full")}) {
     testing::internal::CaptureStderr();
     ConfigureTrace(path.c_str());
     const bool on = TraceOn() && (WriteTraceLine("Refresh()"), TraceOn());
@@ -74,19 +65,14 @@ TEST(TraceTest, ABadTraceFileTurnsTheTraceOff) {
     EXPECT_NE(said.find("calls are not traced\n"), std::string::npos) << said;
   }
   // A name cannot forge a second line: the target is escaped too.
-  const std::string file = std::string(pattern) + "/trace";
-  ConfigureTrace(file.c_str());
+  ConfigureTrace(Path("trace").c_str());
   {
     Call call(nullptr, TARN_OPERATION(GetVlanId), On("pg\nRemovePortGroup(\"x\") on vswitch0"),
               [] { return std::string(); });
   }
   ConfigureTrace(nullptr);
-  std::ifstream in(file);
-  std::string line, rest;
-  std::getline(in, line);
-  EXPECT_EQ(line, "GetVlanId() on pg\\nRemovePortGroup(\\\"x\\\") on vswitch0");
-  EXPECT_FALSE(std::getline(in, rest));
-  std::filesystem::remove_all(pattern);
+  EXPECT_EQ(ReadFile(Path("trace")),
+            "GetVlanId() on pg\\nRemovePortGroup(\\\"x\\\") on vswitch0\n");
 }
 
 }  // namespace
