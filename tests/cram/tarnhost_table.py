@@ -1,6 +1,6 @@
 """Checks that the bash completion offers exactly, and the man page lists
 exactly, the commands and options of tarnhost's command table, as
-`tarnhost help` lists it. Prints each difference, then what was compared.
+`tarnhost help` lists it, and the operations `tarnhost fault ops` lists. Prints each difference, then what was compared.
 
 Usage: tarnhost_table.py SOURCE_DIR (tarnhost on the PATH)"""
 import itertools
@@ -57,6 +57,15 @@ expect("man page commands", man, table)
 for command in set(man) & set(table):
     expect(f"man page options of {' '.join(command)}", man[command], table[command])
 
+# The operations: the man page names each one `fault ops` lists, and the
+# completion of `fault add` offers exactly those a fault can make fail.
+ops = [line.split("\t") for line in
+       subprocess.run(["tarnhost", "fault", "ops"], capture_output=True, text=True).stdout.splitlines()]
+listed = re.search(r"The operations, as the host control interface names them:\n(.*?)\.\n",
+                   "\n".join(lines), re.S)
+expect("man page operations", re.split(r",\s*", listed[1]) if listed else [], [op[0] for op in ops])
+expect("completion of fault add", complete("fault", "add", ""), [op[0] for op in ops if op[1] == "yes"])
+
 for problem in problems:
     print(problem)
-print(f"{len(table)} commands, {sum(map(len, table.values()))} options compared")
+print(f"{len(table)} commands, {sum(map(len, table.values()))} options, {len(ops)} operations compared")
