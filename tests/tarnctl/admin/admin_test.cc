@@ -91,6 +91,9 @@ TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
     return [seed](Host& h) { h.AddDVSwitch(seed); };
   };
   auto fault = [](TarnCtl::Admin::FaultSeed seed) { return [seed](Host& h) { h.AddFault(seed); }; };
+  auto dvport = [](TarnCtl::Admin::DVPortSeed seed) {
+    return [seed](Host& h) { h.AddDVPort(seed); };
+  };
   const std::string tooLong = "0123456789012345678901234567890123";
   const struct {
     std::function<void(Host&)> call;
@@ -114,18 +117,9 @@ TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
        "AddDVSwitch: Virtual switch name " + tooLong + " is too long (at most 31 bytes)"},
       {dvs({"d", {}, "dvs-dvs0", 128, 1500, {}}),
        "AddDVSwitch: A DVS with id dvs-dvs0 already exists on this host"},
-      {[](Host& h) {
-         h.AddDVPort({"nosuch", "10", {}, 0});
-       },
-       "AddDVPort: DVS nosuch does not exist"},
-      {[](Host& h) {
-         h.AddDVPort({"dvs0", "100", {}, 0});
-       },
-       "AddDVPort: DVPort 100 already exists on dvs0"},
-      {[](Host& h) {
-         h.AddDVPort({"dvs0", "7", {"a", "a"}, 0});
-       },
-       "AddDVPort: Client a is given twice"},
+      {dvport({"nosuch", "10", {}, 0}), "AddDVPort: DVS nosuch does not exist"},
+      {dvport({"dvs0", "100", {}, 0}), "AddDVPort: DVPort 100 already exists on dvs0"},
+      {dvport({"dvs0", "7", {"a", "a"}, 0}), "AddDVPort: Client a is given twice"},
       {[](Host& h) {
          h.AddOpaqueSwitch({"o1", {}, 16, 17, {}});
        },
