@@ -2,6 +2,8 @@
 // trace file.
 #include <sys/stat.h>
 
+#include <sstream>
+
 #include "scratch.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/operations.h"
