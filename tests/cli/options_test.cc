@@ -34,9 +34,7 @@ Parsed Parse(const Args& args) {
 }
 
 std::string Show(const Args& args) {
-  std::string text;
-  for (const std::string& arg : args) text += " '" + arg + "'";
-  return text;
+  return testing::PrintToString(args);
 }
 
 TEST(ParseCommandLine, EveryOptionSetsItsBitByLetterAndByName) {

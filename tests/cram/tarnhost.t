@@ -1,7 +1,7 @@
 tarnhost: the administration tool of the simulated host.
 
   $ . "$TESTDIR/setup.sh"
-  $ refused() { "$@" 2>err; echo "status $?"; cat err; }
+  $ refused() { "$@" 2>err; echo "status $? $(cat err)"; }
   $ brief() { # status, output lines joined by |, usage lines cut after the command's words
   >   out=$(tarnhost "$@" 2>&1 < /dev/null)
   >   echo "$? $out" | sed -E 's/(tarnhost [a-z -]*[a-z]) [A-Z[].*/\1 .../' | grep . | paste -sd'|'; }
@@ -60,19 +60,15 @@ of the command, or a hint where none is known, on standard error; status 2.
   > pnic remove pnic9
   > fault ad X
   > pnic add
-  > client add Management
-  > pnic add a b
   > init --empty=yes
   > init --full
   > timeout lag vs0 1 -5
   > timeout add lag vs0 0x10 5
-  > timeout add lag vs0 4294967296 5
   > system-switch add s1 --ports 2147483648
   > system-switch add s1 --ports 64 --ports 64
   > dvs add d1 --uplinks pnic1,,pnic2
   > dvs add d1 --mtu
   > fault add GetName --skip ' 1'
-  > help pnic remove
   > show Management
   > show --json --dot
   > EOF
@@ -84,19 +80,15 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
   2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault del ...|       tarnhost fault list|       tarnhost fault clear|       tarnhost fault ops
   2 tarnhost: missing NAME|usage: tarnhost pnic add ...
-  2 tarnhost: missing CLIENT|usage: tarnhost client add ...
-  2 tarnhost: unexpected argument b|usage: tarnhost pnic add ...
   2 tarnhost: option --empty takes no value|usage: tarnhost init ...
   2 tarnhost: unknown option --full for init|usage: tarnhost init ...
   2 tarnhost: bad number for TIMEOUT: "-5"|usage: tarnhost timeout add lag ...
   2 tarnhost: bad number for LAGID: "0x10"|usage: tarnhost timeout add lag ...
-  2 tarnhost: number for LAGID out of range: 4294967296|usage: tarnhost timeout add lag ...
   2 tarnhost: number for --ports out of range: 2147483648|usage: tarnhost system-switch add ...
   2 tarnhost: option --ports given twice|usage: tarnhost system-switch add ...
   2 tarnhost: empty name in --uplinks|usage: tarnhost dvs add ...
   2 tarnhost: option --mtu needs a value|usage: tarnhost dvs add ...
   2 tarnhost: bad number for --skip: " 1"|usage: tarnhost fault add ...
-  2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
   2 tarnhost: NAME is shown with --json only|usage: tarnhost show ...
   2 tarnhost: --json and --dot exclude each other|usage: tarnhost show ...
   $ ls
@@ -117,7 +109,7 @@ words: the admin test).
   created a new default host at */host.db (glob)
   tarnhost-dump 1 meta:2 pnic:4 vswitch:2 portgroup:2 link:2
   $ for args in 'pnic add pnic0' 'system-switch del vswitch0' 'fault del 1'; do
-  >   refused tarnhost $args; done | paste -d' ' - -
+  >   refused tarnhost $args; done
   status 1 tarnhost: Pnic pnic0 already exists
   status 1 tarnhost: Virtual switch vswitch0 is not a system switch (orvocfg-vswitch -d removes it)
   status 1 tarnhost: Fault 1 does not exist (tarnhost fault list numbers the armed ones)
@@ -199,36 +191,25 @@ Seeding shows up, and a dump brings it all back.
   
   Stored configuration
   $ refused tarnhost pnic del pnic1
-  status 1
-  tarnhost: Pnic pnic1 is linked to dvs0 in the stored configuration (a restore would link it again)
+  status 1 tarnhost: Pnic pnic1 is linked to dvs0 in the stored configuration (a restore would link it again)
   $ tarnhost load - < seeded.json
   $ tarnhost dump | cmp - seeded.json
 
-A faulty dump or file is refused and the host stays as it was.
+A file that cannot be read is refused and the host stays as it was (faulty
+dumps: the admin test).
 
-  $ sed 's/"version": 1/"version": 9/' seeded.json > v9.json
-  $ refused tarnhost load v9.json
-  status 1
-  tarnhost: Cannot load dump: unsupported version 9 (this host reads version 1)
-  $ head -c 300 seeded.json > cut.json
-  $ refused tarnhost load cut.json
-  status 1
-  tarnhost: Cannot load dump: not valid JSON: JSON document ended early in the middle of an object or array.
   $ for f in nosuch.json .; do refused tarnhost load $f; done; refused tarnhost load - < .
-  status 1
-  tarnhost: cannot read nosuch.json: No such file or directory
-  status 1
-  tarnhost: cannot read .: Is a directory
-  status 1
-  tarnhost: cannot read standard input: Is a directory
+  status 1 tarnhost: cannot read nosuch.json: No such file or directory
+  status 1 tarnhost: cannot read .: Is a directory
+  status 1 tarnhost: cannot read standard input: Is a directory
   $ tarnhost dump | cmp - seeded.json
 
 Removal refuses, in the library's words, what a switch, a link or a client
-still needs; a distributed switch goes from the cache too, with its DVPorts.
+still needs (what a removal takes away: the admin test).
 
   $ orvocfg-vswitch -A pgS sys0 && tarnhost client add pgS vmS
   $ tarnhost dvport add dvs0 11 --connection-id 5 && orvocfg-vswitch -P pnic4 -V 11 dvs0
-  $ while read -r args; do refused tarnhost $args; done <<'EOF' | paste -d' ' - -
+  $ while read -r args; do refused tarnhost $args; done <<'EOF'
   > system-switch del sys0
   > dvs del dvs0
   > dvport del dvs0 10
@@ -242,7 +223,6 @@ still needs; a distributed switch goes from the cache too, with its DVPorts.
   status 1 tarnhost: Pnic pnic3 is linked to opq0
   $ tarnhost client del pgS vmS && tarnhost system-switch del sys0 && tarnhost opaque del opq0 &&
   > tarnhost pnic del pnic3 && tarnhost fault del 1 && tarnhost timeout del lag ps0 2
-  $ tarnhost dvs add dvs1 && tarnhost dvport add dvs1 1 && tarnhost dvs del dvs1
   $ for noun in pnic client system-switch dvs dvport opaque timeout fault; do
   >   tarnhost $noun list; done | tr '\t' '|'
   pnic0|vswitch0|vswitch0
@@ -254,9 +234,6 @@ still needs; a distributed switch goes from the cache too, with its DVPorts.
   dvs0|10|7||vmA|vmB
   dvs0|11|5|pnic4
   uplink|vswitch0|pnic0|1|5
-  $ tarnhost show | grep -c dvs1
-  0
-  [1]
 
 Completion offers the host's names, read without waiting for its lock and
 without making a host: a busy or missing host offers none.

@@ -143,7 +143,6 @@ cases=(
     "orvocfg-vswitch -L pn||--add"
     "tarnhost dvs add dvs0 --ports = 8 --p|--portset|--ports --used"
     "tarnhost load /et|/etc|"
-    "tarnhost fault add SetV|SetVlanId|--on"
 )
 for case in "${cases[@]}"; do
     IFS='|' read -r line want refuse <<<"$case"

@@ -8,7 +8,6 @@ the host byte for byte unchanged when it made no library call.
 
 usage: cmdline_fuzz.py BIN_DIR COUNT [SEED]
 """
-import hashlib
 import os
 import random
 import re
@@ -16,6 +15,7 @@ import subprocess
 import sys
 import tempfile
 from concurrent.futures import ThreadPoolExecutor
+from pathlib import Path
 
 # (short, long, takes an argument), read from the parser's own table so that
 # every option it knows gets drawn.
@@ -76,27 +76,20 @@ def random_command_line(rng):
     return words
 
 
-def digest(path):
-    with open(path, "rb") as f:
-        return hashlib.sha256(f.read()).hexdigest()
-
-
 def run_worker(worker, bin_dir, count, seed, failures, statuses):
     rng = random.Random(seed * 1000 + worker)
     tool = os.path.join(bin_dir, "orvocfg-vswitch")
     tarnhost = os.path.join(bin_dir, "tarnhost")
     with tempfile.TemporaryDirectory() as tmp:
-        env = dict(os.environ)
-        env["TARN_HOST_DB"] = os.path.join(tmp, "host.db")
-        env["TARN_TRACE"] = os.path.join(tmp, "trace")
-        env["TARN_LOCK_TIMEOUT"] = "60"
-        env["ASAN_OPTIONS"] = "detect_leaks=1:abort_on_error=0:exitcode=99"
-        env["UBSAN_OPTIONS"] = "print_stacktrace=1:halt_on_error=1:exitcode=98"
+        db, trace = os.path.join(tmp, "host.db"), os.path.join(tmp, "trace")
+        env = dict(os.environ, TARN_HOST_DB=db, TARN_TRACE=trace, TARN_LOCK_TIMEOUT="60",
+                   ASAN_OPTIONS="detect_leaks=1:abort_on_error=0:exitcode=99",
+                   UBSAN_OPTIONS="print_stacktrace=1:halt_on_error=1:exitcode=98")
         for i in range(count):
             if i % 500 == 0:
                 subprocess.run([tarnhost, "init"], env=env, check=True)
-            before = digest(env["TARN_HOST_DB"])
-            open(env["TARN_TRACE"], "wb").close()
+            before = Path(db).read_bytes()
+            Path(trace).write_bytes(b"")
             argv = random_command_line(rng)
             proc = subprocess.run([tool] + argv, env=env, capture_output=True, timeout=120)
             statuses[proc.returncode] = statuses.get(proc.returncode, 0) + 1
@@ -108,7 +101,7 @@ def run_worker(worker, bin_dir, count, seed, failures, statuses):
                     problems.append(name + " does not end with a newline")
             if b"Sanitizer" in proc.stderr or b"runtime error:" in proc.stderr:
                 problems.append("sanitizer report")
-            if os.path.getsize(env["TARN_TRACE"]) == 0 and digest(env["TARN_HOST_DB"]) != before:
+            if os.path.getsize(trace) == 0 and Path(db).read_bytes() != before:
                 problems.append("host changed by a run that made no library call")
             if problems:
                 failures.append((argv, proc.returncode, problems, proc.stderr[-2000:]))

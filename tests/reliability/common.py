@@ -19,8 +19,7 @@ class Host:
         self.env.pop("TARN_LOCK_TIMEOUT", None)  # the default wait is part of the tests
 
     def run(self, *args):
-        return subprocess.run(args, env=self.env, capture_output=True, text=True,
-                              errors="replace")
+        return self.run_as(self.db, *args)
 
     def run_as(self, db, *args):
         """Runs with the host reached through the path `db`."""

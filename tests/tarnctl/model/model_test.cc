@@ -13,11 +13,6 @@ namespace {
 using namespace TarnCtl;
 using Model::NameKind;
 
-// The detailed message of what `body` throws, "" when it throws nothing.
-std::string Detail(const std::function<void()>& body) {
-  return Refused(body).second;
-}
-
 class ModelTest : public ::testing::Test {
  protected:
   ModelTest() : host_(Store::HostFile::Open(Store::Location::Memory(), {})), scope_(db(), "Rule") {}
@@ -52,11 +47,11 @@ TEST_F(ModelTest, NamesAreShortPrintableTextWithoutCommasWhereListed) {
       {NameKind::kSwitchId, "\xed\xa0\x80", "Rule: Switch id is not valid UTF-8 text"},
   };
   for (const auto& c : cases) {
-    EXPECT_EQ(Detail([&] { Model::CheckName(c.kind, c.name); }), c.refusal) << c.name;
+    EXPECT_EQ(Refused([&] { Model::CheckName(c.kind, c.name); }).second, c.refusal) << c.name;
   }
-  EXPECT_EQ(Detail([&] { Model::CheckNewSwitchName(db(), NameKind::kSwitch, "vswitch0"); }),
+  EXPECT_EQ(Refused([&] { Model::CheckNewSwitchName(db(), NameKind::kSwitch, "vswitch0"); }).second,
             "Rule: Virtual switch vswitch0 already exists on this host");
-  EXPECT_EQ(Detail([&] { Model::CheckFreePnic(db(), "pnic0"); }),
+  EXPECT_EQ(Refused([&] { Model::CheckFreePnic(db(), "pnic0"); }).second,
             "Rule: pnic0 is already linked to vswitch0");
 }
 
@@ -76,11 +71,11 @@ TEST_F(ModelTest, RangesAndWordsSayWhatTheyAccept) {
       {Model::kDvsVersion, -1, "Rule: Invalid DVS version -1"},
   };
   for (const auto& c : cases) {
-    EXPECT_EQ(Detail([&] { Model::Check(c.range, c.value); }), c.refusal) << c.value;
+    EXPECT_EQ(Refused([&] { Model::Check(c.range, c.value); }).second, c.refusal) << c.value;
   }
-  EXPECT_EQ(Detail([] { Model::Check(Model::kUsedPorts, 9, 8); }),
+  EXPECT_EQ(Refused([] { Model::Check(Model::kUsedPorts, 9, 8); }).second,
             "Rule: Invalid number of used ports 9 (0-8)");
-  EXPECT_EQ(Detail([] { Model::CdpStatusOfWord("Both"); }),
+  EXPECT_EQ(Refused([] { Model::CdpStatusOfWord("Both"); }).second,
             "Rule: Unknown CDP status Both (expected down, listen, advertise or both)");
   EXPECT_EQ(Model::CdpWord(2), "advertise");
   EXPECT_EQ(Model::CdpWord(7), "7");
