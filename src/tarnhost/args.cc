@@ -5,14 +5,14 @@
 
 namespace TarnHost {
 
-const OptionSpec* Syntax::Option(const std::string& name) const {
+const OptionDef* Syntax::Option(const std::string& name) const {
   for (const auto& o : options) {
     if (name == o.name) return &o;
   }
   return nullptr;
 }
 
-std::string OptionSpec::Usage() const {
+std::string OptionDef::Usage() const {
   return "--" + std::string(name) + (TakesValue() ? " " + std::string(value) : "");
 }
 
@@ -72,7 +72,7 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
     }
     const auto eq = word.find('=');
     const std::string name = word.substr(2, eq == std::string::npos ? eq : eq - 2);
-    const OptionSpec* known = word.compare(0, 2, "--") == 0 ? syntax.Option(name) : nullptr;
+    const OptionDef* known = word.compare(0, 2, "--") == 0 ? syntax.Option(name) : nullptr;
     if (!known) {
       std::vector<std::string> names;
       for (const auto& o : syntax.options) names.push_back("--" + std::string(o.name));
@@ -98,17 +98,17 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
   }
   if (help_) return;
   if (mistake) throw UsageError(*mistake);
-  const auto& specs = syntax.arguments;
+  const auto& defs = syntax.arguments;
   const size_t required =
-      std::count_if(specs.begin(), specs.end(), [](const ArgumentSpec& a) { return !a.optional; });
+      std::count_if(defs.begin(), defs.end(), [](const ArgumentDef& a) { return !a.optional; });
   if (positional_.size() < required) {
     std::string missing = "missing";
     for (size_t k = positional_.size(); k < required; ++k)
-      missing += " " + std::string(specs[k].name);
+      missing += " " + std::string(defs[k].name);
     throw UsageError(missing);
   }
-  if (positional_.size() > specs.size() && (specs.empty() || !specs.back().repeats)) {
-    throw UsageError("unexpected argument " + positional_[specs.size()]);
+  if (positional_.size() > defs.size() && (defs.empty() || !defs.back().repeats)) {
+    throw UsageError("unexpected argument " + positional_[defs.size()]);
   }
 }
 

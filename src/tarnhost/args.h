@@ -41,7 +41,7 @@ enum class Kind {
   Fault,   // the number of an armed fault
 };
 
-struct OptionSpec {
+struct OptionDef {
   const char* name;             // without the leading "--"
   const char* value = nullptr;  // placeholder of its value in usage text; none: a flag
   bool repeatable = false;
@@ -52,7 +52,7 @@ struct OptionSpec {
   std::string Usage() const;  // "--name VALUE"
 };
 
-struct ArgumentSpec {
+struct ArgumentDef {
   const char* name;  // placeholder in usage text, e.g. PORTGROUP
   Kind kind = Kind::Text;
   bool optional = false;
@@ -60,11 +60,11 @@ struct ArgumentSpec {
 };
 
 struct Syntax {
-  std::vector<ArgumentSpec> arguments = {};
-  std::vector<OptionSpec> options = {};
+  std::vector<ArgumentDef> arguments = {};
+  std::vector<OptionDef> options = {};
   bool raw = false;  // every word is an argument: no options, no --help
 
-  const OptionSpec* Option(const std::string& name) const;
+  const OptionDef* Option(const std::string& name) const;
   // The arguments and options as usage text shows them.
   std::string Synopsis() const;
 };

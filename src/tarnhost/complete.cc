@@ -123,7 +123,7 @@ int Complete(const Args& args) {
   // Where the current word stands: after an option that wants its value,
   // after "--", or at which argument.
   const Syntax& syntax = command->syntax;
-  const OptionSpec* pending = nullptr;
+  const OptionDef* pending = nullptr;
   bool optionsEnded = syntax.raw;
   Words given, options;
   for (size_t i = used; i < before.size(); ++i) {
@@ -136,7 +136,7 @@ int Complete(const Args& args) {
       optionsEnded = true;
     } else if (word[1] == '-') {
       const std::string name = word.substr(0, word.find('='));
-      const OptionSpec* o = syntax.Option(name.substr(2));
+      const OptionDef* o = syntax.Option(name.substr(2));
       if (o && o->TakesValue() && name == word) pending = o;
       options.push_back(name);
     }
@@ -144,7 +144,7 @@ int Complete(const Args& args) {
   if (pending) return OfferValue(pending->kind, {}, current);
   if (!optionsEnded && current.compare(0, 2, "--") == 0 && current.find('=') != std::string::npos) {
     const std::string name = current.substr(0, current.find('='));
-    const OptionSpec* o = syntax.Option(name.substr(2));
+    const OptionDef* o = syntax.Option(name.substr(2));
     if (!o || !o->TakesValue()) return Offer("words", {}, current);
     return OfferValue(o->kind, {}, current.substr(name.size() + 1), name + "=");
   }
@@ -158,13 +158,13 @@ int Complete(const Args& args) {
     }
     return Offer("words", names, current);
   }
-  const auto& specs = syntax.arguments;
-  const ArgumentSpec* spec = given.size() < specs.size()              ? &specs[given.size()]
-                             : !specs.empty() && specs.back().repeats ? &specs.back()
-                                                                      : nullptr;
-  if (spec && spec->kind == Kind::File) return Offer("files", {}, current);
-  if (!spec) return Offer("words", {}, current);
-  return OfferValue(spec->kind, given, current);
+  const auto& defs = syntax.arguments;
+  const ArgumentDef* def = given.size() < defs.size()             ? &defs[given.size()]
+                           : !defs.empty() && defs.back().repeats ? &defs.back()
+                                                                  : nullptr;
+  if (def && def->kind == Kind::File) return Offer("files", {}, current);
+  if (!def) return Offer("words", {}, current);
+  return OfferValue(def->kind, given, current);
 }
 
 }  // namespace TarnHost

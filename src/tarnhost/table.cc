@@ -12,14 +12,13 @@ namespace {
 using TarnCtl::Admin::Listing;
 
 // Options that several commands share.
-const OptionSpec kPorts{
+const OptionDef kPorts{
     .name = "ports", .value = "N", .help = "number of ports (default 128)", .kind = Kind::Number};
-const OptionSpec kPortset{
-    .name = "portset", .value = "NAME", .help = "portset name (default NAME)"};
-const OptionSpec kUplinks{.name = "uplinks",
-                          .value = "A,B,...",
-                          .help = "uplinks: pnics that no switch uses",
-                          .kind = Kind::PnicList};
+const OptionDef kPortset{.name = "portset", .value = "NAME", .help = "portset name (default NAME)"};
+const OptionDef kUplinks{.name = "uplinks",
+                         .value = "A,B,...",
+                         .help = "uplinks: pnics that no switch uses",
+                         .kind = Kind::PnicList};
 
 #define LIST_FORM \
   " Fields are separated by a tab and lists within a field by commas; an empty field is none."

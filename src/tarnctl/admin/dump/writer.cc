@@ -71,7 +71,6 @@ void Append(std::string& out, const Json& json, int depth) {
   printer.dump(json, true, false, kIndent, kIndent * depth);
 }
 
-
 }  // namespace
 
 std::string Host::Dump(const Progress& progress) {
