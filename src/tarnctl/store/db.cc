@@ -9,6 +9,7 @@
 #include <string_view>
 #include <unordered_map>
 
+#include "tarnctl/store/host_vfs.h"
 #include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Store {
@@ -129,7 +130,7 @@ Db::~Db() {
 std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& path) {
   ConfigureOnce();
   sqlite3* handle = nullptr;
-  const int rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
+  const int rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, HostVfsName());
   if (handle != nullptr) sqlite3_busy_timeout(handle, kBusyTimeoutMs);
   std::unique_ptr<Db> db(new Db(handle, path));
   if (rc != SQLITE_OK) db->Fail();
@@ -144,6 +145,43 @@ std::unique_ptr<Db> Db::OpenMemory(const std::string& name) {
   std::unique_ptr<Db> db(new Db(handle, name));
   if (rc != SQLITE_OK) db->Fail();
   return db;
+}
+
+void Db::UseLog() {
+  // A file this process cannot write is read as SQLite reads it by itself
+  // (a log locked exclusively cannot be read without writing).
+  if (sqlite3_db_readonly(handle_, "main") == 1) return;
+  TrustLog(handle_);
+  // Locked exclusively before the log is first read: the log's index then
+  // lives in this process's memory, not in a third file beside the host.
+  Exec("PRAGMA locking_mode=EXCLUSIVE");
+  sqlite3_stmt* stmt = nullptr;
+  if (sqlite3_prepare_v2(handle_, "PRAGMA journal_mode=WAL", -1, &stmt, nullptr) != SQLITE_OK) {
+    Fail();
+  }
+  const bool logged =
+      sqlite3_step(stmt) == SQLITE_ROW &&
+      std::string_view(reinterpret_cast<const char*>(sqlite3_column_text(stmt, 0))) == "wal";
+  sqlite3_finalize(stmt);
+  if (!logged) {  // not expected of a file open for writing; every sync counts then
+    DistrustLog(handle_);
+    Exec("PRAGMA locking_mode=NORMAL; PRAGMA synchronous=FULL");
+    return;
+  }
+  int persist = 1;
+  sqlite3_file_control(handle_, "main", SQLITE_FCNTL_PERSIST_WAL, &persist);
+  // Syncs are the checkpoint's, after each commit: the commit itself need
+  // not sync a log that is synced before the run ends. The log is emptied
+  // also when the run closes it (after a rollback, which leaves frames).
+  Exec("PRAGMA synchronous=NORMAL; PRAGMA wal_autocheckpoint=0; PRAGMA journal_size_limit=0");
+  Checkpoint();
+}
+
+void Db::Checkpoint() {
+  if (sqlite3_wal_checkpoint_v2(handle_, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr) !=
+      SQLITE_OK) {
+    Fail();
+  }
 }
 
 Statement Db::Prepare(const std::string& sql) {
@@ -232,6 +270,7 @@ void Transaction::Commit() {
   db_.Exec(depth_ == 0 ? "COMMIT" : "RELEASE inner");
   db_.depth_ = depth_;
   done_ = true;
+  if (depth_ == 0) db_.Checkpoint();
 }
 
 }  // namespace TarnCtl::Store

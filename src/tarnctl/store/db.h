@@ -73,6 +73,16 @@ class Db {
 
   const std::string& path() const { return path_; }
 
+  // Commits through a write-ahead log beside the file, copied into the file
+  // after every commit (host_vfs.h tells why that costs two syncs a
+  // change), and copies in what a killed run committed and did not copy.
+  // A file this process cannot write is only read, as SQLite reads it.
+  // REQUIRES: right after OpenFile, before anything else is read.
+  void UseLog();
+  // Copies the log into the file, syncing both, and empties it. Nothing
+  // without a log. Transaction::Commit calls it after the outermost commit.
+  void Checkpoint();
+
   Statement Prepare(const std::string& sql);
   // Runs SQL without results (several statements allowed).
   void Exec(const std::string& sql);

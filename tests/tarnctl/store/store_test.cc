@@ -61,8 +61,10 @@ TEST_F(StoreTest, AMissingOrEmptyFileBecomesTheDefaultHostInPlace) {
     EXPECT_EQ(Pnics::Names(host->db()).size(), 4u);
   }
   EXPECT_FALSE(Open(missing)->created());
-  // Nothing but the host files themselves: no lock files, no journals.
-  EXPECT_EQ(Listing(), (std::vector<std::string>{"empty.db", "sub"}));
+  // Nothing but the host files and their logs, empty between runs: no lock
+  // files, no journals.
+  EXPECT_EQ(Listing(), (std::vector<std::string>{"empty.db", "empty.db-wal", "sub"}));
+  EXPECT_EQ(fs::file_size(Path("empty.db-wal")), 0u);
   EXPECT_EQ(Refusal([&] {
               HostFile::Open(Location::File(Path("none.db")), {0, false});
             }),
