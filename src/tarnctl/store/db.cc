@@ -3,6 +3,7 @@
 #include "tarnctl/store/db.h"
 
 #include <sqlite3.h>
+#include <sys/stat.h>
 
 #include <atomic>
 #include <cassert>
@@ -37,6 +38,11 @@ void ConfigureOnce() {
     return true;
   }();
   (void)configured;
+}
+
+// Copies the write-ahead log into the file, syncing both, and empties it.
+int CopyLogIn(sqlite3* handle) {
+  return sqlite3_wal_checkpoint_v2(handle, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr);
 }
 
 }  // namespace
@@ -168,18 +174,19 @@ void Db::UseLog() {
     Exec("PRAGMA locking_mode=NORMAL; PRAGMA synchronous=FULL");
     return;
   }
+  // After each commit that wrote to the log (SQLite's hook: its error is
+  // the commit's, though the commit stands).
+  sqlite3_wal_hook(
+      handle_, [](void*, sqlite3* handle, const char*, int) { return CopyLogIn(handle); }, nullptr);
   int persist = 1;
   sqlite3_file_control(handle_, "main", SQLITE_FCNTL_PERSIST_WAL, &persist);
   // Syncs are the checkpoint's, after each commit: the commit itself need
   // not sync a log that is synced before the run ends. The log is emptied
   // also when the run closes it (after a rollback, which leaves frames).
   Exec("PRAGMA synchronous=NORMAL; PRAGMA wal_autocheckpoint=0; PRAGMA journal_size_limit=0");
-  Checkpoint();
-}
-
-void Db::Checkpoint() {
-  if (sqlite3_wal_checkpoint_v2(handle_, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr) !=
-      SQLITE_OK) {
+  struct stat log;
+  if (stat((std::string(sqlite3_db_filename(handle_, "main")) + "-wal").c_str(), &log) == 0 &&
+      log.st_size > 0 && CopyLogIn(handle_) != SQLITE_OK) {
     Fail();
   }
 }
@@ -270,7 +277,6 @@ void Transaction::Commit() {
   db_.Exec(depth_ == 0 ? "COMMIT" : "RELEASE inner");
   db_.depth_ = depth_;
   done_ = true;
-  if (depth_ == 0) db_.Checkpoint();
 }
 
 }  // namespace TarnCtl::Store

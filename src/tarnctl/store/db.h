@@ -79,9 +79,6 @@ class Db {
   // A file this process cannot write is only read, as SQLite reads it.
   // REQUIRES: right after OpenFile, before anything else is read.
   void UseLog();
-  // Copies the log into the file, syncing both, and empties it. Nothing
-  // without a log. Transaction::Commit calls it after the outermost commit.
-  void Checkpoint();
 
   Statement Prepare(const std::string& sql);
   // Runs SQL without results (several statements allowed).

@@ -242,8 +242,9 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
         // groups) are read through a mapping rather than a read() a page: a
         // lookup costs no system call per level of its tree. Mapped pages
         // count as resident, so the mapping stays small.
+        db->Exec("PRAGMA mmap_size=8388608");
         db->UseLog();
-        db->Exec("PRAGMA mmap_size=8388608; SELECT count(*) FROM sqlite_schema");
+        db->Exec("SELECT count(*) FROM sqlite_schema");
       } catch (const HostCtlException& e) {
         throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2), kReplace);
       }
