@@ -127,6 +127,29 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
 
 // One lock per file: a symbolic link and a hard link reach the same lock,
 // and SQLite always opens the file by one name (so its journal is shared).
+// A run killed between its commit and the copy into the file leaves the
+// commit in the log: the next opening copies it in and empties the log.
+TEST_F(StoreTest, AKilledRunsCommitIsCopiedInByTheNextOpening) {
+  const std::string host = Path("host.db");
+  Open(host);
+  {
+    auto killed = Db::OpenFile(host, "host");  // commits without copying in
+    killed->Exec(
+        "PRAGMA locking_mode=EXCLUSIVE; PRAGMA wal_autocheckpoint=0;"
+        " INSERT INTO meta VALUES ('left', 'in the log')");
+    fs::copy(host, Path("file"));
+    fs::copy(host + "-wal", Path("log"));
+  }
+  fs::copy(Path("file"), host, fs::copy_options::overwrite_existing);
+  fs::copy(Path("log"), host + "-wal", fs::copy_options::overwrite_existing);
+  ASSERT_GT(fs::file_size(host + "-wal"), 0u);
+  auto opened = Open(host);
+  EXPECT_EQ(fs::file_size(host + "-wal"), 0u);
+  auto row = opened->db().Prepare("SELECT value FROM meta WHERE key = 'left'");
+  ASSERT_TRUE(row.Step());
+  EXPECT_EQ(row.Text(0), "in the log");
+}
+
 TEST_F(StoreTest, EveryPathToTheFileSharesItsLock) {
   auto held = Open(Path("host.db"));
   fs::create_symlink(Path("host.db"), Path("alias.db"));
