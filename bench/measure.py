@@ -3,7 +3,7 @@
 - counts, which do not move with the machine's load, one run each:
   instructions (valgrind --tool=callgrind; the same binary on the same
   input executes the same instructions) and system calls (strace -f):
-  fsync-family calls on any file, reads and writes on the host file;
+  fsync-family calls on any file, reads and writes on the host file and its log;
 - peak resident size, through /usr/bin/time, a small program, because a
   child's peak includes the memory of the process that forked it;
 - wall time, which does: the runs of the cases of a comparison are
@@ -38,8 +38,8 @@ def missing_tools():
 class Counts:
     instructions: int = 0
     fsyncs: int = 0
-    reads: int = 0   # read-family calls on the host file
-    writes: int = 0  # write-family calls on the host file
+    reads: int = 0   # read-family calls on the host file and its log
+    writes: int = 0  # write-family calls on the host file and its log
 
     def __add__(self, other):
         return Counts(*(a + b for a, b in zip(self.values(), other.values())))
@@ -73,7 +73,8 @@ def instructions(argv, env, scratch):
 
 
 def syscalls(argv, env, scratch, db):
-    """(fsync-family calls, reads of `db`, writes of `db`) of one run of argv."""
+    """(fsync-family calls, reads of `db` and its log, writes of them) of one
+    run of argv."""
     out = scratch + ".strace"
     names = ",".join(FSYNCS + READS + WRITES)
     cmd = ["strace", "-f", "-qq", "--seccomp-bpf", "-y", "-s", "0", "-e", "trace=" + names,
@@ -81,7 +82,7 @@ def syscalls(argv, env, scratch, db):
     proc = subprocess.run(cmd, env=env, stdout=subprocess.DEVNULL, stderr=subprocess.PIPE)
     check_exit(argv, proc)
     fsyncs = reads = writes = 0
-    db = os.path.realpath(db) if db else None
+    files = {os.path.realpath(db), os.path.realpath(db) + "-wal"} if db else set()
     with open(out, errors="replace") as f:
         for line in f:
             m = CALL.match(line)
@@ -90,7 +91,7 @@ def syscalls(argv, env, scratch, db):
             name, path = m.group(1), m.group(3)
             if name in FSYNCS:
                 fsyncs += 1
-            elif db and path == db:
+            elif path in files:
                 reads += name in READS
                 writes += name in WRITES
     os.unlink(out)

@@ -3,7 +3,7 @@
 
 Builds hosts with `tarnhost load` of generated dumps and measures whole runs
 of the real binaries: per command, instructions (callgrind), fsync-family
-calls and reads and writes of the host file (strace), the median wall time
+calls and reads and writes of the host file and its log (strace), the median wall time
 with the fastest and slowest run and the least processor time; the peak
 resident size of -l. Then it prints each target (the constants below) with
 its figure and verdict. docs/performance.md describes the method, the
@@ -310,7 +310,7 @@ def main():
         if not args.keep:
             shutil.rmtree(work, ignore_errors=True)
     print()
-    print("Measurements (counts: one run each; reads and writes: calls on the host file;"
+    print("Measurements (counts: one run each; reads and writes: calls on the host file and its log;"
           " fsyncs: on any file)")
     print(bench.measurements())
     rows = bench.targets()

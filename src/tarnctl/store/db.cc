@@ -191,6 +191,10 @@ void Db::UseLog() {
   }
 }
 
+void Db::PrepareBulkChange() {
+  Exec("PRAGMA cache_size=-65536");
+}
+
 Statement Db::Prepare(const std::string& sql) {
   auto found = cache_->statements.find(sql);
   if (found != cache_->statements.end()) return Statement(*this, found->second.get());

@@ -79,6 +79,10 @@ class Db {
   // A file this process cannot write is only read, as SQLite reads it.
   // REQUIRES: right after OpenFile, before anything else is read.
   void UseLog();
+  // For a change that rewrites the whole host (a load): a page cache that
+  // holds it (up to 64 MiB), so that its pages go to the log once rather
+  // than spilling there and being read back.
+  void PrepareBulkChange();
 
   Statement Prepare(const std::string& sql);
   // Runs SQL without results (several statements allowed).

@@ -455,6 +455,7 @@ class Loader {
 void Host::Load(const std::string& text, const Progress& progress) {
   Store::Db& db = state_->db();
   Instrument::Scope scope(db, "Load");
+  db.PrepareBulkChange();
   Store::Transaction transaction(db);
   for (const auto& table : Dump::Tables()) Store::Rows::Clear(db, table.Shape());
   Loader loader(db, progress);
