@@ -174,16 +174,18 @@ void Db::UseLog() {
     Exec("PRAGMA locking_mode=NORMAL; PRAGMA synchronous=FULL");
     return;
   }
-  // After each commit that wrote to the log (SQLite's hook: its error is
-  // the commit's, though the commit stands).
-  sqlite3_wal_hook(
-      handle_, [](void*, sqlite3* handle, const char*, int) { return CopyLogIn(handle); }, nullptr);
   int persist = 1;
   sqlite3_file_control(handle_, "main", SQLITE_FCNTL_PERSIST_WAL, &persist);
-  // Syncs are the checkpoint's, after each commit: the commit itself need
-  // not sync a log that is synced before the run ends. The log is emptied
-  // also when the run closes it (after a rollback, which leaves frames).
-  Exec("PRAGMA synchronous=NORMAL; PRAGMA wal_autocheckpoint=0; PRAGMA journal_size_limit=0");
+  // Syncs are the copy's, after each commit: the commit itself need not
+  // sync a log that is synced before the run ends. The log is emptied also
+  // when the run closes it (after a rollback, which leaves frames).
+  Exec("PRAGMA synchronous=NORMAL; PRAGMA journal_size_limit=0");
+  // The copy runs after each commit that wrote to the log, in SQLite's
+  // commit hook: its error is the commit's, though the commit stands. (The
+  // hook replaces SQLite's own checkpoints, and is replaced by any
+  // wal_autocheckpoint pragma.)
+  sqlite3_wal_hook(
+      handle_, [](void*, sqlite3* handle, const char*, int) { return CopyLogIn(handle); }, nullptr);
   struct stat log;
   if (stat((std::string(sqlite3_db_filename(handle_, "main")) + "-wal").c_str(), &log) == 0 &&
       log.st_size > 0 && CopyLogIn(handle_) != SQLITE_OK) {

@@ -243,14 +243,19 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
         // lookup costs no system call per level of its tree. Mapped pages
         // count as resident, so the mapping stays small.
         db->Exec("PRAGMA mmap_size=8388608");
-        db->UseLog();
+        if (hasHost) db->UseLog();
         db->Exec("SELECT count(*) FROM sqlite_schema");
       } catch (const HostCtlException& e) {
         throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2), kReplace);
       }
       if (!hasHost) {
+        // Built with a rollback journal, before the log is used: the
+        // header that CheckHeader reads (application id, schema version)
+        // is then in the file itself from the first commit on, and a
+        // crash while building leaves an empty file, as before.
         try {
           BuildDefaultHost(*db);
+          db->UseLog();
         } catch (const HostCtlException& e) {
           throw CannotCreate(path, e.GetMessage());
         }
