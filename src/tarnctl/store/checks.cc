@@ -21,10 +21,14 @@ Offender First(Db& db, const char* sql, int columns) {
 
 }  // namespace
 
+// Looks up each switch that port groups name once, not once per port group
+// (the port groups of a switch are next to each other in portgroup_switch).
 Offender PortGroupWithoutSwitch(Db& db) {
   return First(db,
-               "SELECT name, switch, layer FROM portgroup p WHERE NOT EXISTS"
-               " (SELECT 1 FROM vswitch v WHERE v.layer = p.layer AND v.name = p.switch) LIMIT 1",
+               "SELECT p.name, p.switch, p.layer FROM"
+               " (SELECT DISTINCT switch, layer FROM portgroup) d, portgroup p"
+               " WHERE NOT EXISTS (SELECT 1 FROM vswitch v WHERE v.layer = d.layer"
+               " AND v.name = d.switch) AND p.switch = d.switch AND p.layer = d.layer LIMIT 1",
                3);
 }
 
