@@ -319,17 +319,33 @@ class Loader {
         return text;
       }
       case Kind::kPolicy: {
-        HostCtl::Network::NicTeamingPolicy policy;
-        PolicyReader reader(*this, c, v, "");
-        Store::VisitTeamingFields(policy, reader);
-        reader.RefuseOthers();
-        Apply(c, [&] { Model::CheckTeamingPolicy(policy); });
-        return Store::EncodeTeamingPolicy(policy);
+        // The rows of a host share a few policies: each text is read once.
+        ondemand::object object;
+        std::string_view raw;
+        if (v.get_object().get(object) || object.raw_json().get(raw)) {
+          BadField(c, "must be an object");
+        }
+        auto known = policies_.find(raw);
+        if (known == policies_.end()) known = policies_.emplace(raw, ReadPolicy(c, raw)).first;
+        return known->second;
       }
       case Kind::kNames:
         return Store::EncodeNameList(NamesField(c, v));
     }
     return std::monostate{};
+  }
+
+  // The stored form of the policy whose JSON text is `raw`, checked.
+  std::string ReadPolicy(const Column& c, std::string_view raw) {
+    const simdjson::padded_string text(raw);
+    auto document = Must<ondemand::document>(policyParser_.iterate(text));
+    auto value = Must<ondemand::value>(document.get_value());
+    HostCtl::Network::NicTeamingPolicy policy;
+    PolicyReader reader(*this, c, value, "");
+    Store::VisitTeamingFields(policy, reader);
+    reader.RefuseOthers();
+    Apply(c, [&] { Model::CheckTeamingPolicy(policy); });
+    return Store::EncodeTeamingPolicy(policy);
   }
 
   void ReadRow(ondemand::object row, Store::Rows::Inserter& inserter) {
@@ -448,6 +464,8 @@ class Loader {
   int64_t placeholders_ = 0;
   std::map<std::string, std::string> meta_;
   std::map<std::string, Store::Rows::Inserter> inserters_;
+  ondemand::parser policyParser_;
+  std::map<std::string, std::string, std::less<>> policies_;  // JSON text, stored form
 };
 
 }  // namespace
