@@ -29,12 +29,15 @@ Db::Observer g_observer = nullptr;
 // A process of this library uses its connections from one thread at a time
 // (the host's lock admits one process, and the programs are single
 // threaded): SQLite's own mutexes and memory statistics would only cost.
+// The page cache takes its pages one at a time as they are read: by default
+// it sets out room for 20 at the first page, writing into every one of them,
+// and most runs read fewer (20 of the 145 page faults of a -c run).
 // REQUIRES: before the first connection; runs once.
 void ConfigureOnce() {
   static const bool configured = [] {
     sqlite3_config(SQLITE_CONFIG_SINGLETHREAD);
     sqlite3_config(SQLITE_CONFIG_MEMSTATUS, 0);
-    sqlite3_config(SQLITE_CONFIG_LOOKASIDE, 256, 256);
+    sqlite3_config(SQLITE_CONFIG_PAGECACHE, nullptr, 0, 0);
     return true;
   }();
   (void)configured;
