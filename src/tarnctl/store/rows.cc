@@ -87,10 +87,6 @@ void AssignPlaceholders(Db& db, const Shape& shape, const char* column, int64_t 
       .Run();
 }
 
-int64_t Max(Db& db, const Shape& shape, const char* column) {
-  return Single(db, std::string("SELECT coalesce(max(") + column + "), 0) FROM " + shape.table);
-}
-
 int64_t Count(Db& db, const Shape& shape) {
   return Single(db, std::string("SELECT count(*) FROM ") + shape.table);
 }

@@ -46,8 +46,6 @@ void Clear(Db& db, const Shape& shape);
 // Turns every negative value -k of `column` into base + k: placeholders
 // for values that are assigned once all rows are in.
 void AssignPlaceholders(Db& db, const Shape& shape, const char* column, int64_t base);
-// The largest value of `column`, or 0 for an empty table.
-int64_t Max(Db& db, const Shape& shape, const char* column);
 int64_t Count(Db& db, const Shape& shape);
 
 }  // namespace TarnCtl::Store::Rows

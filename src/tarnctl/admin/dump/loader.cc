@@ -366,11 +366,17 @@ class Loader {
       ondemand::value value = Must<ondemand::value>(field.value());
       values[i] = ValueOf(t.columns[i], value);
     }
+    Counter* counter = t.counter != nullptr ? &counters_[&t] : nullptr;
     for (size_t i = 0; i < t.columns.size(); ++i) {
-      if (given[i]) continue;
       const Column& c = t.columns[i];
-      if (t.counter == nullptr || std::string(c.name) != t.counter) BadField(c, "is missing");
+      const bool isCounter = counter != nullptr && std::string_view(c.name) == t.counter;
+      if (given[i]) {
+        if (isCounter) counter->given = std::max(counter->given, std::get<int64_t>(values[i]));
+        continue;
+      }
+      if (!isCounter) BadField(c, "is missing");
       values[i] = -++placeholders_;  // a placeholder, assigned in Finish()
+      counter->lastPlaceholder = placeholders_;
     }
     CheckRow(t, values);
     if (!inserter.Insert(values)) {
@@ -398,7 +404,7 @@ class Loader {
     const auto next = NextSeqGiven();
     int64_t given = 0;
     for (const Table& t : Dump::Tables()) {
-      if (IsSeq(t)) given = std::max(given, Store::Rows::Max(db_, t.Shape(), "seq"));
+      if (IsSeq(t)) given = std::max(given, counters_[&t].given);
     }
     if (next && *next <= given) {
       Bad("meta key \"next_seq\" (" + std::to_string(*next) + ") is not beyond the largest seq (" +
@@ -408,10 +414,14 @@ class Loader {
     int64_t maxSeq = 0;
     for (const Table& t : Dump::Tables()) {
       if (t.counter == nullptr) continue;
-      Store::Rows::AssignPlaceholders(
-          db_, t.Shape(), t.counter,
-          IsSeq(t) ? base : std::max<int64_t>(0, Store::Rows::Max(db_, t.Shape(), t.counter)));
-      if (IsSeq(t)) maxSeq = std::max(maxSeq, Store::Rows::Max(db_, t.Shape(), "seq"));
+      const Counter& counter = counters_[&t];
+      const int64_t from = IsSeq(t) ? base : counter.given;
+      int64_t largest = counter.given;
+      if (counter.lastPlaceholder > 0) {
+        Store::Rows::AssignPlaceholders(db_, t.Shape(), t.counter, from);
+        largest = std::max(largest, from + counter.lastPlaceholder);
+      }
+      if (IsSeq(t)) maxSeq = std::max(maxSeq, largest);
     }
     if (!Model::Within(Model::kSeq, maxSeq + 1)) {
       Bad("the largest seq (" + std::to_string(maxSeq) + ") leaves no room for the counter");
@@ -462,6 +472,13 @@ class Loader {
   int64_t rowNumber_ = 0;
   int64_t rows_ = 0;
   int64_t placeholders_ = 0;
+  // Of a table's counter column: the largest value given, and the largest
+  // placeholder that stands for a value left out (0: none).
+  struct Counter {
+    int64_t given = 0;
+    int64_t lastPlaceholder = 0;
+  };
+  std::map<const Table*, Counter> counters_;
   std::map<std::string, std::string> meta_;
   std::map<std::string, Store::Rows::Inserter> inserters_;
   ondemand::parser policyParser_;
