@@ -90,6 +90,14 @@ Statement& Statement::Bind(int index, const std::string& value) {
   return *this;
 }
 
+Statement& Statement::BindView(int index, std::string_view value) {
+  if (sqlite3_bind_text(cached_->stmt, index, value.data(), static_cast<int>(value.size()),
+                        SQLITE_STATIC) != SQLITE_OK) {
+    db_->Fail();
+  }
+  return *this;
+}
+
 Statement& Statement::BindNull(int index) {
   if (sqlite3_bind_null(cached_->stmt, index) != SQLITE_OK) db_->Fail();
   return *this;

@@ -16,6 +16,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "hostctl/exception.h"
@@ -37,6 +38,9 @@ class Statement {
   // Parameters are numbered from 1.
   Statement& Bind(int index, int64_t value);
   Statement& Bind(int index, const std::string& value);
+  // Binds `value` without a copy of its own.
+  // REQUIRES: `value` outlives this handle (the binding goes with it).
+  Statement& BindView(int index, std::string_view value);
   Statement& BindNull(int index);
 
   // Advances to the next row: true while a row is available.

@@ -32,7 +32,7 @@ bool InsertValues(Db& db, const std::string& sql, const std::vector<Value>& valu
     if (const auto* number = std::get_if<int64_t>(&values[i])) {
       insert.Bind(index, *number);
     } else if (const auto* text = std::get_if<std::string>(&values[i])) {
-      insert.Bind(index, *text);
+      insert.BindView(index, *text);
     } else {
       insert.BindNull(index);
     }
