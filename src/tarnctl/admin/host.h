@@ -165,7 +165,10 @@ class Host {
   // Load(Dump()) leaves a host whose Dump() is the same text.
   std::string Dump(const Progress& progress = nullptr);
   // Replaces the whole host with a dump; refuses a malformed or
-  // inconsistent dump without changing anything.
+  // inconsistent dump without changing anything. A `json` whose capacity
+  // exceeds its size by kLoadRoom bytes is read in place, another from a
+  // copy (which, for a large dump, doubles the memory the load touches).
+  static constexpr size_t kLoadRoom = 64;
   void Load(const std::string& json, const Progress& progress = nullptr);
 
   struct State;

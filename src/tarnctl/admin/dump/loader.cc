@@ -107,7 +107,12 @@ class Loader {
   Loader(Store::Db& db, const Progress& progress) : db_(db), progress_(progress) {}
 
   void Read(const std::string& text) {
-    const simdjson::padded_string padded(text);
+    static_assert(Host::kLoadRoom >= simdjson::SIMDJSON_PADDING);
+    // The parser reads up to simdjson::SIMDJSON_PADDING bytes past the text.
+    std::optional<simdjson::padded_string> copy;
+    if (text.capacity() - text.size() < simdjson::SIMDJSON_PADDING) copy.emplace(text);
+    const simdjson::padded_string_view padded =
+        copy ? simdjson::padded_string_view(*copy) : simdjson::padded_string_view(text);
     ondemand::parser parser;
     auto document = Must<ondemand::document>(parser.iterate(padded));
     const auto type = Must<ondemand::json_type>(document.type());
