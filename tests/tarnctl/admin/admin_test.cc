@@ -76,6 +76,30 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
     const std::string all = copy.Show();
     return all.substr(0, all.find("Faults"));
   }());
+
+  // One seq left out among given ones: it goes after the largest, and the
+  // counter after it.
+  document = nlohmann::json::parse(good);
+  auto& groups = document["tables"]["portgroup"];
+  groups[0].erase("seq");
+  document["tables"]["meta"] = nlohmann::json::array();
+  int64_t largest = 0;
+  for (auto& [name, rows] : document["tables"].items()) {
+    for (auto& row : rows) largest = std::max<int64_t>(largest, row.value("seq", 0));
+  }
+  host.Load(document.dump());
+  const auto loaded = nlohmann::json::parse(host.Dump())["tables"];
+  int64_t assigned = 0;
+  for (const auto& row : loaded["portgroup"]) {
+    if (row["name"] == groups[0]["name"] && row["layer"] == groups[0]["layer"])
+      assigned = row["seq"];
+  }
+  EXPECT_EQ(assigned, largest + 1);
+  std::string next;
+  for (const auto& row : loaded["meta"]) {
+    if (row["key"] == "next_seq") next = row["value"];
+  }
+  EXPECT_EQ(next, std::to_string(largest + 2));
 }
 
 // Each refusal of seeding and removal in its words (the detailed message,
