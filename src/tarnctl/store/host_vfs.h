@@ -2,8 +2,8 @@
 // things it cannot know by itself about the way the store uses the log.
 //
 // A change is committed to the write-ahead log beside the host file
-// (`<file>-wal`) and copied into the file at once (Db::Checkpoint after
-// every commit), after which the log is emptied. So:
+// (`<file>-wal`) and copied into the file at once (SQLite's commit hook,
+// set by Db::UseLog), after which the log is emptied. So:
 //  - The log holds at most one transaction when a new one starts it again.
 //    A log left half-rewritten by a power failure can only bring back that
 //    transaction, which the file already holds: the log's header needs no
@@ -16,8 +16,9 @@
 // A change then costs two syncs: the log, then the file.
 //
 // REQUIRES for the first point: the connection is in write-ahead mode,
-// locked exclusively, and checkpoints after every commit; HostFile::Open
-// sets that up and calls TrustLog() only once the mode is confirmed.
+// locked exclusively, and copies the log in after every commit; Db::UseLog
+// sets that up, and gives TrustLog() back (DistrustLog) when the mode is
+// not confirmed.
 #pragma once
 
 struct sqlite3;
