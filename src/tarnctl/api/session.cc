@@ -37,6 +37,12 @@ Session::~Session() {
 
 void Session::End() noexcept {
   if (!run_) return;
+  if (!host_->db().InTransaction()) {
+    // SQLite ended the run after a failure, which its operation reported:
+    // nothing is left to commit, or to say.
+    run_.reset();
+    return;
+  }
   try {
     run_->Commit();
     run_.reset();
@@ -48,7 +54,12 @@ void Session::End() noexcept {
 }
 
 void Session::Commit() {
-  run_->Commit();
+  try {
+    run_->Commit();
+  } catch (const HostCtlException&) {
+    run_.reset();  // undoes what a failed commit left open; the caller reports the failure
+    throw;
+  }
   run_.reset();
   run_.emplace(host_->db());
 }

@@ -50,14 +50,15 @@ class Session {
   Store::Db& db() { return host_->db(); }
   const std::string& path() const { return host_->path(); }
 
-  // Commits the run so far (throwing what the commit meets) and goes on in
-  // a new transaction.
+  // Commits the run so far and goes on in a new transaction. A failed
+  // commit throws what it met, and the session commits nothing more.
   void Commit();
 
  private:
   explicit Session(std::unique_ptr<Store::HostFile> host);
   // Commits the run for good; a failure is reported on standard error and
-  // ends the process with status 1, since the run's changes are lost.
+  // ends the process with status 1 (the message says whether the change
+  // stood). A run that SQLite already ended after a failure is left alone.
   void End() noexcept;
 
   std::unique_ptr<Store::HostFile> host_;

@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <signal.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -56,7 +57,23 @@ struct TraceFile {
   std::string path;  // "" when off
   int fd = -1;
   bool broken = false;  // could not be opened or written: off
+  // The file ends inside a line (a write cut short, on a full disk, say):
+  // the next line starts on a line of its own.
+  bool torn = false;
 };
+
+// Whether the file at `path`, open for appending as `fd`, ends inside a
+// line.
+bool EndsTorn(int fd, const char* path) {
+  struct stat info;
+  if (fstat(fd, &info) != 0 || !S_ISREG(info.st_mode) || info.st_size == 0) return false;
+  const int reader = open(path, O_RDONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
+  if (reader < 0) return false;
+  char last = '\n';
+  const bool torn = pread(reader, &last, 1, info.st_size - 1) == 1 && last != '\n';
+  close(reader);
+  return torn;
+}
 
 TraceFile& File() {
   static TraceFile file;
@@ -178,7 +195,11 @@ void ConfigureTrace(const char* path) {
   file = TraceFile{true, wanted, -1, false};
   if (wanted.empty()) return;
   file.fd = open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOCTTY | O_NONBLOCK, 0644);
-  if (file.fd < 0) TurnOff(file, "open");
+  if (file.fd < 0) {
+    TurnOff(file, "open");
+    return;
+  }
+  file.torn = EndsTorn(file.fd, path);
 }
 
 bool TraceOn() {
@@ -189,7 +210,7 @@ bool TraceOn() {
 
 void WriteTraceLine(const std::string& line) {
   TraceFile& file = File();
-  const std::string whole = line + '\n';
+  const std::string whole = (file.torn ? "\n" : "") + line + '\n';
   // A FIFO whose reader went away must not end the process: SIGPIPE is
   // held back around the write and taken back if the write raised it.
   sigset_t pipe, previous;
@@ -210,6 +231,19 @@ void WriteTraceLine(const std::string& line) {
   if (written < 0) {
     errno = error;
     TurnOff(file, "write");
+  } else if (static_cast<size_t>(written) < whole.size()) {
+    // Cut short: the rest, or the reason it cannot be written. A line left
+    // cut is ended by the next program that traces to this file.
+    const size_t rest = whole.size() - static_cast<size_t>(written);
+    errno = 0;
+    if (write(file.fd, whole.data() + written, rest) == static_cast<ssize_t>(rest)) {
+      file.torn = false;
+      return;
+    }
+    if (errno == 0) errno = ENOSPC;
+    TurnOff(file, "write");
+  } else {
+    file.torn = false;
   }
 }
 

@@ -5,6 +5,7 @@
 #include <sqlite3.h>
 #include <sys/stat.h>
 
+#include <array>
 #include <atomic>
 #include <cassert>
 #include <string_view>
@@ -46,6 +47,33 @@ void ConfigureOnce() {
 // Copies the write-ahead log into the file, syncing both, and empties it.
 int CopyLogIn(sqlite3* handle) {
   return sqlite3_wal_checkpoint_v2(handle, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr);
+}
+
+Db::Failure FailureOf(int code) {
+  switch (code & 0xff) {
+    case SQLITE_OK:
+    case SQLITE_ROW:
+    case SQLITE_DONE:
+      return Db::Failure::kNone;
+    case SQLITE_IOERR:
+      return Db::Failure::kIo;
+    case SQLITE_FULL:
+      return Db::Failure::kFull;
+    case SQLITE_READONLY:
+    case SQLITE_PERM:
+    case SQLITE_CANTOPEN:
+    case SQLITE_AUTH:
+      return Db::Failure::kPermission;
+    case SQLITE_CORRUPT:
+      return Db::Failure::kCorrupt;
+    case SQLITE_NOTADB:
+      return Db::Failure::kNotADatabase;
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+      return Db::Failure::kBusy;
+    default:
+      return Db::Failure::kOther;
+  }
 }
 
 }  // namespace
@@ -137,21 +165,38 @@ bool Statement::IsInteger(int column) const {
 // --- Db ---
 
 Db::Db(sqlite3* handle, std::string path)
-    : handle_(handle), path_(std::move(path)), serial_(++g_serials), cache_(new Cache) {}
+    : handle_(handle),
+      path_(std::move(path)),
+      serial_(++g_serials),
+      ioFailuresAtOpen_(IoFailures()),
+      cache_(new Cache) {}
 
 Db::~Db() {
   for (auto& [sql, cached] : cache_->statements) sqlite3_finalize(cached->stmt);
   sqlite3_close_v2(handle_);
 }
 
-std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& path) {
+std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& path, Access access) {
   ConfigureOnce();
   sqlite3* handle = nullptr;
-  const int rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, HostVfsName());
+  int rc;
+  if (access == Access::kWrite) {
+    rc = sqlite3_open_v2(file.c_str(), &handle, SQLITE_OPEN_READWRITE, HostVfsName());
+  } else {
+    // Immutable: SQLite then reads the file alone, takes no lock of its own
+    // and creates nothing beside it; the host's lock keeps writers out.
+    sqlite3_filename uri = sqlite3_create_filename(
+        file.c_str(), "", "", 1, std::array<const char*, 2>{"immutable", "1"}.data());
+    rc = sqlite3_open_v2(uri, &handle, SQLITE_OPEN_READONLY | SQLITE_OPEN_URI, HostVfsName());
+    sqlite3_free_filename(uri);
+  }
   if (handle != nullptr) sqlite3_busy_timeout(handle, kBusyTimeoutMs);
   std::unique_ptr<Db> db(new Db(handle, path));
   if (rc != SQLITE_OK) db->Fail();
   sqlite3_extended_result_codes(handle, 1);
+  // Temporary data (the statement journal of a large change, sorts) stays
+  // in memory, not in a directory elsewhere that may be full or missing.
+  db->Exec("PRAGMA temp_store=MEMORY");
   return db;
 }
 
@@ -164,11 +209,9 @@ std::unique_ptr<Db> Db::OpenMemory(const std::string& name) {
   return db;
 }
 
-void Db::UseLog() {
-  // A file this process cannot write is read as SQLite reads it by itself
-  // (a log locked exclusively cannot be read without writing).
-  if (sqlite3_db_readonly(handle_, "main") == 1) return;
-  TrustLog(handle_);
+void Db::UseLog(bool logged) {
+  assert(sqlite3_db_readonly(handle_, "main") == 0);
+  if (logged) TrustLog(handle_);
   // Locked exclusively before the log is first read: the log's index then
   // lives in this process's memory, not in a third file beside the host.
   Exec("PRAGMA locking_mode=EXCLUSIVE");
@@ -176,11 +219,13 @@ void Db::UseLog() {
   if (sqlite3_prepare_v2(handle_, "PRAGMA journal_mode=WAL", -1, &stmt, nullptr) != SQLITE_OK) {
     Fail();
   }
-  const bool logged =
-      sqlite3_step(stmt) == SQLITE_ROW &&
+  const int rc = sqlite3_step(stmt);
+  const bool inLog =
+      rc == SQLITE_ROW &&
       std::string_view(reinterpret_cast<const char*>(sqlite3_column_text(stmt, 0))) == "wal";
   sqlite3_finalize(stmt);
-  if (!logged) {  // not expected of a file open for writing; every sync counts then
+  if (rc != SQLITE_ROW) Fail();
+  if (!inLog) {  // not expected of a file open for writing; every sync counts then
     DistrustLog(handle_);
     Exec("PRAGMA locking_mode=NORMAL; PRAGMA synchronous=FULL");
     return;
@@ -196,11 +241,19 @@ void Db::UseLog() {
   // hook replaces SQLite's own checkpoints, and is replaced by any
   // wal_autocheckpoint pragma.)
   sqlite3_wal_hook(
-      handle_, [](void*, sqlite3* handle, const char*, int) { return CopyLogIn(handle); }, nullptr);
+      handle_,
+      [](void* self, sqlite3* handle, const char*, int) {
+        const int rc = CopyLogIn(handle);
+        static_cast<Db*>(self)->copyFailed_ = rc;
+        return rc;
+      },
+      this);
   struct stat log;
   if (stat((std::string(sqlite3_db_filename(handle_, "main")) + "-wal").c_str(), &log) == 0 &&
-      log.st_size > 0 && CopyLogIn(handle_) != SQLITE_OK) {
-    Fail();
+      log.st_size > 0) {
+    // What a killed run or a failed copy left: copied in now, or by this
+    // run's first commit. The log stays valid until a copy succeeds.
+    CopyLogIn(handle_);
   }
 }
 
@@ -242,6 +295,30 @@ std::vector<std::string> Db::QueryPlan(const std::string& sql) {
   return steps;
 }
 
+bool Db::InTransaction() const {
+  return sqlite3_get_autocommit(handle_) == 0;
+}
+
+Db::Failure Db::LastFailure() const {
+  if (handle_ == nullptr) return Failure::kOther;
+  const Failure failure = FailureOf(sqlite3_extended_errcode(handle_));
+  // A read that failed can reach SQLite as a page it cannot make sense of.
+  if ((failure == Failure::kCorrupt || failure == Failure::kNotADatabase) &&
+      IoFailures() != ioFailuresAtOpen_) {
+    return Failure::kIo;
+  }
+  return failure;
+}
+
+std::string Db::Cause() const {
+  if (handle_ == nullptr) return "out of memory";
+  const Failure failure = LastFailure();
+  if (failure == Failure::kIo && FailureOf(sqlite3_extended_errcode(handle_)) != Failure::kIo) {
+    return "disk I/O error";
+  }
+  return sqlite3_errmsg(handle_);
+}
+
 int64_t Db::ChangeCount() const {
   return sqlite3_total_changes64(handle_);
 }
@@ -257,7 +334,7 @@ HostCtlException Db::Error(const std::string& cause) const {
 }
 
 void Db::Fail() const {
-  throw Error(handle_ != nullptr ? sqlite3_errmsg(handle_) : "out of memory");
+  throw Error(Cause());
 }
 
 Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string& name) {
@@ -269,6 +346,11 @@ Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string
 // --- Transaction ---
 
 Transaction::Transaction(Db& db) : db_(db), depth_(db.depth_) {
+  // A savepoint outside SQLite's transaction would start one of its own and
+  // commit alone: the run's transaction was ended by an earlier failure.
+  if (depth_ > 0 && !db_.InTransaction()) {
+    throw db_.Error("the run's earlier changes were undone after a failure");
+  }
   db_.Exec(depth_ == 0 ? "BEGIN IMMEDIATE" : "SAVEPOINT inner");
   ++db_.depth_;
 }
@@ -276,6 +358,7 @@ Transaction::Transaction(Db& db) : db_(db), depth_(db.depth_) {
 Transaction::~Transaction() {
   if (done_) return;
   db_.depth_ = depth_;
+  if (!db_.InTransaction()) return;  // SQLite ended it after a failure
   try {
     if (depth_ == 0) {
       db_.Exec("ROLLBACK");
@@ -291,7 +374,31 @@ Transaction::~Transaction() {
 
 void Transaction::Commit() {
   assert(db_.depth_ == depth_ + 1 && "commit of a transaction that is not the innermost");
-  db_.Exec(depth_ == 0 ? "COMMIT" : "RELEASE inner");
+  db_.copyFailed_ = 0;
+  if (sqlite3_exec(db_.handle_, depth_ == 0 ? "COMMIT" : "RELEASE inner", nullptr, nullptr,
+                   nullptr) != SQLITE_OK) {
+    // Still open (busy): undone by the destructor. Else ended: rolled back,
+    // or committed and then not copied into the file.
+    const bool open = db_.InTransaction();
+    if (!open) {
+      db_.depth_ = depth_;
+      done_ = true;
+    }
+    if (depth_ > 0) db_.Fail();
+    if (open || db_.copyFailed_ == 0) {
+      const bool full = db_.LastFailure() == Db::Failure::kFull;
+      throw db_.Error(db_.Cause() + "; the change was not made" +
+                      (full ? " (free space, then run it again)" : ""));
+    }
+    const bool full = FailureOf(db_.copyFailed_) == Db::Failure::kFull;
+    throw db_.Error(std::string("the change was made, but copying it from the log into the "
+                                "host file failed (") +
+                    (full ? "database or disk is full" : "disk I/O error") + "): it waits in " +
+                    sqlite3_db_filename(db_.handle_, "main") +
+                    "-wal, and the next program to open the host "
+                    "copies it in" +
+                    (full ? " (free space first)" : ""));
+  }
   db_.depth_ = depth_;
   done_ = true;
 }

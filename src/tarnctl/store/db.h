@@ -65,9 +65,17 @@ class Statement {
 
 class Db {
  public:
-  // Opens the existing database file `file` read-write; `path` is how
-  // messages name it. The busy timeout is set before anything is read.
-  static std::unique_ptr<Db> OpenFile(const std::string& file, const std::string& path);
+  // How OpenFile opens a file.
+  enum class Access {
+    kWrite,  // read-write; a file that cannot be opened so is an error, not
+             // opened read-only behind the caller's back
+    kRead,   // read-only, and trusting that nobody changes the file while it
+             // is open (the caller holds its lock): no log, nothing created
+  };
+  // Opens the existing database file `file`; `path` is how messages name
+  // it. The busy timeout is set before anything is read.
+  static std::unique_ptr<Db> OpenFile(const std::string& file, const std::string& path,
+                                      Access access = Access::kWrite);
   // A private database in memory, named `name` in messages.
   static std::unique_ptr<Db> OpenMemory(const std::string& name);
 
@@ -81,8 +89,13 @@ class Db {
   // after every commit (host_vfs.h tells why that costs two syncs a
   // change), and copies in what a killed run committed and did not copy.
   // A file this process cannot write is only read, as SQLite reads it.
-  // REQUIRES: right after OpenFile, before anything else is read.
-  void UseLog();
+  // `logged`: the file's header says it is in write-ahead mode; only then is
+  // the log's header trusted to reach the disk with its frames (host_vfs.h).
+  // A log that cannot be copied in now is left for the next commit's copy
+  // (reads go through it meanwhile): a host on a full disk can be read.
+  // REQUIRES: right after OpenFile with Access::kWrite, before anything
+  // else is read.
+  void UseLog(bool logged);
   // For a change that rewrites the whole host (a load): a page cache that
   // holds it (up to 64 MiB), so that its pages go to the log once rather
   // than spilling there and being read back.
@@ -111,6 +124,14 @@ class Db {
 
   // Transaction nesting (transaction.h keeps it).
   int depth() const { return depth_; }
+  // Whether SQLite holds a transaction open. False inside a Transaction
+  // when SQLite ended it by itself (an I/O error or a full disk rolls it
+  // back).
+  bool InTransaction() const;
+
+  // What kind of failure the last failed call of this connection met.
+  enum class Failure { kNone, kIo, kFull, kPermission, kCorrupt, kNotADatabase, kBusy, kOther };
+  Failure LastFailure() const;
 
   // Called with the SQL text and context() of every statement a
   // connection of this process prepares, once per connection (for the test
@@ -121,6 +142,9 @@ class Db {
   // The database failure `cause` on this file.
   HostCtl::Lib::HostCtlException Error(const std::string& cause) const;
   [[noreturn]] void Fail() const;
+  // SQLite's text for the last failure, with the reason the system gave
+  // when it was an I/O error that SQLite reports as something else.
+  std::string Cause() const;
 
  private:
   friend class Statement;
@@ -130,8 +154,12 @@ class Db {
   sqlite3* handle_;
   std::string path_;
   uint64_t serial_;
+  uint64_t ioFailuresAtOpen_;  // IoFailures() when it was opened
   const char* context_ = nullptr;
   int depth_ = 0;
+  // The copy of the log into the file after the last commit failed with
+  // this SQLite code (0: it did not fail); set by the commit hook.
+  int copyFailed_ = 0;
   struct Cache;
   std::unique_ptr<Cache> cache_;
 };

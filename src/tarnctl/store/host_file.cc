@@ -39,10 +39,16 @@ constexpr char kSqliteMagic[16] = "SQLite format 3";
 constexpr size_t kHeaderSize = 100;
 constexpr size_t kUserVersionOffset = 60;
 constexpr size_t kApplicationIdOffset = 68;
+// The file format's write and read versions: 2 in write-ahead mode.
+constexpr size_t kWriteVersionOffset = 18;
+constexpr size_t kReadVersionOffset = 19;
+constexpr unsigned char kWalVersion = 2;
 
 // What to do about a host file that cannot be used: every such message ends
 // with one of these, so that its one line names the file, the cause and the
-// way out.
+// way out. Moving a file away or making a new host is advised only for a
+// file that is positively not a host: for a host that failed to open, that
+// advice would leave its log (and any change waiting there) behind.
 constexpr const char* kReplace =
     "set TARN_HOST_DB to a host file, or move it away and run tarnhost init";
 constexpr const char* kAnother = "set TARN_HOST_DB to a host file";
@@ -51,15 +57,66 @@ constexpr const char* kNewer =
     "use the newer release that made it, or set TARN_HOST_DB to another host file";
 constexpr const char* kReach = "check the path and its permissions, or set TARN_HOST_DB";
 constexpr const char* kWritable = "set TARN_HOST_DB to a file in a writable directory";
+constexpr const char* kRetry =
+    "the host was not changed; try again, and check the disk if it fails again";
+constexpr const char* kFree = "the host was not changed; free space on its disk and try again";
+constexpr const char* kPermissions =
+    "the host was not changed; check the permissions of the file, its log and its directory";
+constexpr const char* kDamaged =
+    "the host was not changed; keep a copy of it and of its log (the file beside it ending "
+    "in -wal) before you repair or replace it";
 
 HostCtlException CannotOpen(const std::string& path, const std::string& cause, const char* remedy) {
   const std::string text = "Cannot open host database " + path + ": " + cause + "; " + remedy;
   return HostCtlException(text, text);
 }
 
-HostCtlException CannotCreate(const std::string& path, const std::string& cause) {
-  const std::string text = "Cannot create host database " + path + ": " + cause + "; " + kWritable;
+HostCtlException CannotCreate(const std::string& path, const std::string& cause,
+                              const char* remedy = kWritable) {
+  const std::string text = "Cannot create host database " + path + ": " + cause + "; " + remedy;
   return HostCtlException(text, text);
+}
+
+// What to do after a system call on the host's files failed with `error`.
+const char* RemedyFor(int error) {
+  switch (error) {
+    case EACCES:
+    case EPERM:
+    case EROFS:
+      return kPermissions;
+    case ENOSPC:
+    case EDQUOT:
+      return kFree;
+    case ENOENT:
+    case ENOTDIR:
+    case ELOOP:
+    case ENAMETOOLONG:
+      return kReach;
+    default:
+      return kRetry;
+  }
+}
+
+HostCtlException CannotOpenErrno(const std::string& path, const std::string& what, int error) {
+  return CannotOpen(path, what + std::strerror(error), RemedyFor(error));
+}
+
+// The failure `db` met while opening, as what it is.
+HostCtlException CannotOpen(const std::string& path, const Db& db) {
+  switch (db.LastFailure()) {
+    case Db::Failure::kIo:
+      return CannotOpen(path, db.Cause(), kRetry);
+    case Db::Failure::kFull:
+      return CannotOpen(path, db.Cause(), kFree);
+    case Db::Failure::kPermission:
+      return CannotOpen(path, db.Cause(), kPermissions);
+    case Db::Failure::kNotADatabase:
+      return CannotOpen(path, "not a host database (" + db.Cause() + ")", kReplace);
+    case Db::Failure::kCorrupt:
+      return CannotOpen(path, db.Cause(), kDamaged);
+    default:
+      return CannotOpen(path, db.Cause(), kRetry);
+  }
 }
 
 std::string Directory(const std::string& path) {
@@ -83,18 +140,33 @@ int32_t BigEndian32(const unsigned char* bytes) {
                               (uint32_t{bytes[2]} << 8) | uint32_t{bytes[3]});
 }
 
+// open() and pread() again when a signal interrupted them.
+int OpenRetried(const char* path, int flags, mode_t mode = 0) {
+  int fd;
+  do fd = open(path, flags, mode);
+  while (fd < 0 && errno == EINTR);
+  return fd;
+}
+
+ssize_t ReadRetried(int fd, void* buffer, size_t size, off_t offset) {
+  ssize_t got;
+  do got = pread(fd, buffer, size, offset);
+  while (got < 0 && errno == EINTR);
+  return got;
+}
+
 // Opens `path` for its lock (reading only: no file is changed by it), and
 // creates it when it is missing and `create` is set. O_NONBLOCK: opening a
 // FIFO must not wait for a writer.
 int OpenForLock(const std::string& path, bool create) {
-  int fd = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
+  int fd = OpenRetried(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOCTTY | O_NONBLOCK);
   if (fd >= 0 || errno != ENOENT) {
-    if (fd < 0) throw CannotOpen(path, std::strerror(errno), kReach);
+    if (fd < 0) throw CannotOpenErrno(path, "", errno);
     return fd;
   }
   if (!create) throw CannotOpen(path, "no host yet", kInit);
   PrepareDirectory(path);
-  fd = open(path.c_str(), O_RDONLY | O_CREAT | O_CLOEXEC | O_NOCTTY, 0644);
+  fd = OpenRetried(path.c_str(), O_RDONLY | O_CREAT | O_CLOEXEC | O_NOCTTY, 0644);
   if (fd < 0) throw CannotCreate(path, std::strerror(errno));
   return fd;
 }
@@ -104,8 +176,7 @@ void Lock(int fd, const std::string& path, int timeoutSeconds) {
   auto poll = std::chrono::milliseconds(1);
   while (flock(fd, LOCK_EX | LOCK_NB) != 0) {
     if (errno == EINTR) continue;
-    if (errno != EWOULDBLOCK)
-      throw CannotOpen(path, std::string("cannot lock it: ") + std::strerror(errno), kReach);
+    if (errno != EWOULDBLOCK) throw CannotOpenErrno(path, "cannot lock it: ", errno);
     if (std::chrono::steady_clock::now() >= deadline) {
       const std::string text = "Host " + path + " is busy: another process holds its lock";
       throw HostCtlException(text, text + " (waited " + std::to_string(timeoutSeconds) + " s)");
@@ -115,15 +186,22 @@ void Lock(int fd, const std::string& path, int timeoutSeconds) {
   }
 }
 
-// Refuses what is not a host database of a version this library reads;
-// false for an empty file (no host yet).
-bool CheckHeader(int fd, const struct stat& info, const std::string& path) {
+// What a file's first bytes say of it.
+enum class Header {
+  kEmpty,   // no host yet
+  kHost,    // a host in rollback-journal mode (made by an older release)
+  kLogged,  // a host in write-ahead mode
+};
+
+// Reads the header of the file `fd` holds: refuses what is not a host
+// database of a version this library reads.
+Header ReadHeader(int fd, const struct stat& info, const std::string& path) {
   if (S_ISDIR(info.st_mode)) throw CannotOpen(path, "is a directory", kAnother);
   if (!S_ISREG(info.st_mode)) throw CannotOpen(path, "is not a regular file", kAnother);
-  if (info.st_size == 0) return false;
+  if (info.st_size == 0) return Header::kEmpty;
   unsigned char header[kHeaderSize] = {};
-  const ssize_t read = pread(fd, header, sizeof header, 0);
-  if (read < 0) throw CannotOpen(path, std::strerror(errno), kReach);
+  const ssize_t read = ReadRetried(fd, header, sizeof header, 0);
+  if (read < 0) throw CannotOpenErrno(path, "cannot read its header: ", errno);
   if (static_cast<size_t>(read) < sizeof kSqliteMagic ||
       std::memcmp(header, kSqliteMagic, sizeof kSqliteMagic) != 0) {
     throw CannotOpen(path, "not a host database (not an SQLite database)", kReplace);
@@ -146,21 +224,21 @@ bool CheckHeader(int fd, const struct stat& info, const std::string& path) {
                      kNewer);
   }
   if (version < 1) throw CannotOpen(path, "not a host database (no schema version)", kReplace);
-  return true;
+  return header[kWriteVersionOffset] == kWalVersion && header[kReadVersionOffset] == kWalVersion
+             ? Header::kLogged
+             : Header::kHost;
 }
 
 // The one path by which SQLite opens the file that `fd` holds: symbolic
 // links resolved, and of hard links in one directory the least name.
 std::string JournalPath(const std::string& path, const struct stat& info) {
   char resolved[PATH_MAX];
-  if (realpath(path.c_str(), resolved) == nullptr) {
-    throw CannotOpen(path, std::strerror(errno), kReach);
-  }
+  if (realpath(path.c_str(), resolved) == nullptr) throw CannotOpenErrno(path, "", errno);
   const std::string real = resolved;
   if (info.st_nlink <= 1) return real;
   const std::string directory = Directory(real);
   DIR* dir = opendir(directory.c_str());
-  if (dir == nullptr) throw CannotOpen(path, std::strerror(errno), kReach);
+  if (dir == nullptr) throw CannotOpenErrno(path, "", errno);
   std::vector<std::string> names;
   while (const dirent* entry = readdir(dir)) {
     struct stat other;
@@ -186,6 +264,161 @@ void BuildDefaultHost(Db& db) {
   db.Exec("PRAGMA application_id=" + std::to_string(kApplicationId) + "; PRAGMA user_version=" +
           std::to_string(kSchemaVersion) + ";" + kSchemaSql + kDefaultHostSql);
   transaction.Commit();
+}
+
+bool Exists(const std::string& file, off_t* size = nullptr) {
+  struct stat info;
+  if (stat(file.c_str(), &info) != 0) return false;
+  if (size != nullptr) *size = info.st_size;
+  return true;
+}
+
+void SyncDirectory(const std::string& path, const std::string& directory) {
+  const int fd = OpenRetried(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+  if (fd < 0 || fsync(fd) != 0) {
+    const int error = errno;
+    if (fd >= 0) close(fd);
+    throw CannotCreate(path, std::string("cannot sync its directory: ") + std::strerror(error),
+                       RemedyFor(error));
+  }
+  close(fd);
+}
+
+// Builds the default host in a new file beside `real` (the host file as
+// SQLite names it) and renames it over `real`: a crash at any point leaves
+// `real` as it was (empty, or half-made by an older release) or a whole host,
+// and at worst `<real>.new` beside it, which the next creation replaces.
+// Returns the new file's descriptor, locked; `held` becomes its status.
+// REQUIRES: the caller holds the lock of the file now at `real`.
+int CreateHost(const std::string& path, const std::string& real, struct stat* held) {
+  off_t logSize = 0;
+  if (Exists(real + "-wal", &logSize) && logSize > 0) {
+    // Another file's committed changes: a new host beside them would take
+    // them for its own.
+    throw CannotCreate(path,
+                       real +
+                           "-wal holds changes of a host file that is not there (moved away "
+                           "without its log?)",
+                       "move the log to the host file it belongs to; nothing was changed");
+  }
+  const std::string building = real + ".new";
+  unlink(building.c_str());
+  const int fd = OpenRetried(building.c_str(), O_RDWR | O_CREAT | O_EXCL | O_CLOEXEC | O_NOCTTY,
+                             held->st_mode & 07777);
+  if (fd < 0) throw CannotCreate(path, std::strerror(errno));
+  try {
+    if (fchmod(fd, held->st_mode & 07777) != 0 || flock(fd, LOCK_EX) != 0) {
+      throw CannotCreate(path, std::strerror(errno), RemedyFor(errno));
+    }
+    if (fchown(fd, held->st_uid, held->st_gid) != 0) {
+      // Another user's empty file: the new host is this user's.
+    }
+    {
+      // The file is thrown away if anything fails: no journal, no syncs
+      // but the one below. Closing it copies its log in and removes it.
+      auto db = Db::OpenFile(building, path);
+      try {
+        db->Exec("PRAGMA locking_mode=EXCLUSIVE; PRAGMA journal_mode=OFF; PRAGMA synchronous=OFF");
+        BuildDefaultHost(*db);
+        db->Exec("PRAGMA journal_mode=WAL");
+      } catch (const HostCtlException&) {
+        throw CannotCreate(path, db->Cause(), RemedyFor(EIO));
+      }
+    }
+    if (fdatasync(fd) != 0) throw CannotCreate(path, std::strerror(errno), RemedyFor(errno));
+    if (rename(building.c_str(), real.c_str()) != 0) {
+      throw CannotCreate(path, std::strerror(errno), RemedyFor(errno));
+    }
+  } catch (...) {
+    unlink(building.c_str());
+    close(fd);
+    throw;
+  }
+  try {
+    SyncDirectory(path, Directory(real));
+    if (fstat(fd, held) != 0) throw CannotOpenErrno(path, "", errno);
+  } catch (...) {
+    close(fd);
+    throw;
+  }
+  return fd;
+}
+
+// An older release built a new host in the file itself, with a rollback
+// journal: a run killed then left a journal that SQLite must roll back
+// before the header means anything. Rolls it back, unless the file is
+// positively another application's.
+void RollBackCreation(int fd, const std::string& real, const std::string& path) {
+  off_t size = 0;
+  if (!Exists(real + "-journal", &size) || size == 0) return;
+  unsigned char header[kHeaderSize] = {};
+  const ssize_t read = ReadRetried(fd, header, sizeof header, 0);
+  if (read == static_cast<ssize_t>(kHeaderSize) &&
+      std::memcmp(header, kSqliteMagic, sizeof kSqliteMagic) == 0) {
+    const int32_t applicationId = BigEndian32(header + kApplicationIdOffset);
+    if (applicationId != 0 && applicationId != kApplicationId) return;
+  }
+  auto db = Db::OpenFile(real, path);
+  try {
+    db->Exec("PRAGMA schema_version");
+  } catch (const HostCtlException&) {
+    throw CannotOpen(path, *db);
+  }
+}
+
+// Whether this process can change the host at `real`: write the file, and
+// its log or else the directory the log is made in.
+bool Writable(const std::string& real) {
+  if (access(real.c_str(), W_OK) != 0) return false;
+  const std::string log = real + "-wal";
+  if (Exists(log)) return access(log.c_str(), W_OK) == 0;
+  return access(Directory(real).c_str(), W_OK) == 0;
+}
+
+// Opens the host at `real` for SQLite: read-write through its log, or only
+// read when this process cannot write it.
+std::unique_ptr<Db> Connect(const std::string& real, const std::string& path, Header header) {
+  if (!Writable(real)) {
+    off_t logSize = 0;
+    if (Exists(real + "-wal", &logSize) && logSize > 0) {
+      throw CannotOpen(path,
+                       "a change waits in its log " + real + "-wal, which this user cannot copy in",
+                       "the host was not changed; run as a user who can write the file, its log "
+                       "and its directory");
+    }
+    auto db = Db::OpenFile(real, path, Db::Access::kRead);
+    try {
+      db->Exec("SELECT count(*) FROM sqlite_schema");
+    } catch (const HostCtlException&) {
+      throw CannotOpen(path, *db);
+    }
+    return db;
+  }
+  auto db = Db::OpenFile(real, path);
+  try {
+    // Reading the schema finds a file that is damaged past its header. The
+    // first 8 MiB of the file (all of a host of some 60,000 port groups)
+    // are read through a mapping rather than a read() a page: a lookup
+    // costs no system call per level of its tree. Mapped pages count as
+    // resident, so the mapping stays small.
+    db->Exec("PRAGMA mmap_size=8388608");
+    db->UseLog(header == Header::kLogged);
+    db->Exec("SELECT count(*) FROM sqlite_schema");
+  } catch (const HostCtlException&) {
+    throw CannotOpen(path, *db);
+  }
+  return db;
+}
+
+// A host whose creation by an older release did not finish: SQLite's
+// header is there, the tables are not.
+bool HalfMade(Db& db, const std::string& path) {
+  try {
+    auto statement = db.Prepare("SELECT 1 FROM sqlite_schema WHERE name = 'meta'");
+    return !statement.Step();
+  } catch (const HostCtlException&) {
+    throw CannotOpen(path, db);
+  }
 }
 
 }  // namespace
@@ -221,46 +454,44 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
     return std::unique_ptr<HostFile>(new HostFile(path, -1, std::move(db), false));
   }
   for (;;) {
-    const int fd = OpenForLock(path, options.create);
+    int fd = OpenForLock(path, options.create);
     try {
       Lock(fd, path, options.lockTimeoutSeconds);
       struct stat held, named;
-      if (fstat(fd, &held) != 0) throw CannotOpen(path, std::strerror(errno), kReach);
+      if (fstat(fd, &held) != 0) throw CannotOpenErrno(path, "", errno);
       if (stat(path.c_str(), &named) != 0 || named.st_ino != held.st_ino ||
           named.st_dev != held.st_dev) {
         close(fd);  // replaced or removed while we waited: take the new one
         continue;
       }
-      const bool hasHost = CheckHeader(fd, held, path);
-      if (!hasHost && !options.create) {
-        throw CannotOpen(path, "no host yet (empty file)", kInit);
+      if (S_ISREG(held.st_mode)) {
+        RollBackCreation(fd, JournalPath(path, held), path);
+        if (fstat(fd, &held) != 0) throw CannotOpenErrno(path, "", errno);
       }
-      auto db = Db::OpenFile(JournalPath(path, held), path);
-      try {
-        // Reading the schema finds a file that is damaged past its header.
-        // The first 8 MiB of the file (all of a host of some 60,000 port
-        // groups) are read through a mapping rather than a read() a page: a
-        // lookup costs no system call per level of its tree. Mapped pages
-        // count as resident, so the mapping stays small.
-        db->Exec("PRAGMA mmap_size=8388608");
-        if (hasHost) db->UseLog();
-        db->Exec("SELECT count(*) FROM sqlite_schema");
-      } catch (const HostCtlException& e) {
-        throw CannotOpen(path, e.GetMessage().substr(e.GetMessage().rfind(": ") + 2), kReplace);
+      Header header = ReadHeader(fd, held, path);
+      const std::string real = JournalPath(path, held);
+      std::unique_ptr<Db> db;
+      bool halfMade = false;
+      if (header != Header::kEmpty) {
+        db = Connect(real, path, header);
+        halfMade = HalfMade(*db, path);
+        if (halfMade) db.reset();
       }
-      if (!hasHost) {
-        // Built with a rollback journal, before the log is used: the
-        // header that CheckHeader reads (application id, schema version)
-        // is then in the file itself from the first commit on, and a
-        // crash while building leaves an empty file, as before.
-        try {
-          BuildDefaultHost(*db);
-          db->UseLog();
-        } catch (const HostCtlException& e) {
-          throw CannotCreate(path, e.GetMessage());
+      bool created = false;
+      if (!db) {
+        if (!options.create) {
+          throw CannotOpen(
+              path,
+              halfMade ? "no host yet (its creation did not finish)" : "no host yet (empty file)",
+              kInit);
         }
+        const int made = CreateHost(path, real, &held);
+        close(fd);
+        fd = made;
+        db = Connect(real, path, Header::kLogged);
+        created = true;
       }
-      return std::unique_ptr<HostFile>(new HostFile(path, fd, std::move(db), !hasHost));
+      return std::unique_ptr<HostFile>(new HostFile(path, fd, std::move(db), created));
     } catch (...) {
       close(fd);
       throw;

@@ -108,7 +108,9 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
        "set TARN_HOST_DB to another host file"},
       {"text.db", "not a host database (not an SQLite database)" + init},
       {"short.db", "not a host database (truncated header)" + init},
-      {"cut.db", "database disk image is malformed" + init},
+      {"cut.db",
+       "database disk image is malformed; the host was not changed; keep a copy of it and of its "
+       "log (the file beside it ending in -wal) before you repair or replace it"},
       {"dir.db", "is a directory; set TARN_HOST_DB to a host file"},
       {"fifo.db", "is not a regular file; set TARN_HOST_DB to a host file"},
   };
