@@ -5,8 +5,8 @@
 #include <sqlite3.h>
 #include <sys/stat.h>
 
-#include <array>
 #include <atomic>
+#include <cstdio>
 #include <cassert>
 #include <string_view>
 #include <unordered_map>
@@ -185,13 +185,23 @@ std::unique_ptr<Db> Db::OpenFile(const std::string& file, const std::string& pat
   } else {
     // Immutable: SQLite then reads the file alone, takes no lock of its own
     // and creates nothing beside it; the host's lock keeps writers out.
-    sqlite3_filename uri = sqlite3_create_filename(
-        file.c_str(), "", "", 1, std::array<const char*, 2>{"immutable", "1"}.data());
-    rc = sqlite3_open_v2(uri, &handle, SQLITE_OPEN_READONLY | SQLITE_OPEN_URI, HostVfsName());
-    sqlite3_free_filename(uri);
+    std::string uri = "file:";
+    for (const char c : file) {
+      if (c == '%' || c == '?' || c == '#') {
+        char escaped[4];
+        std::snprintf(escaped, sizeof escaped, "%%%02X", static_cast<unsigned char>(c));
+        uri += escaped;
+      } else {
+        uri += c;
+      }
+    }
+    uri += "?immutable=1";
+    rc = sqlite3_open_v2(uri.c_str(), &handle, SQLITE_OPEN_READONLY | SQLITE_OPEN_URI,
+                         HostVfsName());
   }
   if (handle != nullptr) sqlite3_busy_timeout(handle, kBusyTimeoutMs);
   std::unique_ptr<Db> db(new Db(handle, path));
+  db->readOnly_ = access == Access::kRead;
   if (rc != SQLITE_OK) db->Fail();
   sqlite3_extended_result_codes(handle, 1);
   // Temporary data (the statement journal of a large change, sorts) stays
@@ -316,6 +326,9 @@ std::string Db::Cause() const {
   if (failure == Failure::kIo && FailureOf(sqlite3_extended_errcode(handle_)) != Failure::kIo) {
     return "disk I/O error";
   }
+  if (readOnly_ && (sqlite3_extended_errcode(handle_) & 0xff) == SQLITE_READONLY) {
+    return "this user can only read it (the file, its log or their directory is not writable)";
+  }
   return sqlite3_errmsg(handle_);
 }
 
@@ -333,8 +346,9 @@ HostCtlException Db::Error(const std::string& cause) const {
                           context_ != nullptr ? std::string(context_) + ": " + message : message);
 }
 
-void Db::Fail() const {
-  throw Error(Cause());
+void Db::Fail(const std::string& more) const {
+  const std::string cause = Cause();
+  throw DbFailure(Error(cause + more), LastFailure(), cause);
 }
 
 Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string& name) {
@@ -387,17 +401,17 @@ void Transaction::Commit() {
     if (depth_ > 0) db_.Fail();
     if (open || db_.copyFailed_ == 0) {
       const bool full = db_.LastFailure() == Db::Failure::kFull;
-      throw db_.Error(db_.Cause() + "; the change was not made" +
-                      (full ? " (free space, then run it again)" : ""));
+      db_.Fail(std::string("; the change was not made") +
+               (full ? " (free space, then run it again)" : ""));
     }
     const bool full = FailureOf(db_.copyFailed_) == Db::Failure::kFull;
-    throw db_.Error(std::string("the change was made, but copying it from the log into the "
-                                "host file failed (") +
-                    (full ? "database or disk is full" : "disk I/O error") + "): it waits in " +
-                    sqlite3_db_filename(db_.handle_, "main") +
-                    "-wal, and the next program to open the host "
-                    "copies it in" +
-                    (full ? " (free space first)" : ""));
+    const std::string cause = full ? "database or disk is full" : "disk I/O error";
+    throw DbFailure(db_.Error("the change was made, but copying it from the log into the host "
+                              "file failed (" +
+                              cause + "): it waits in " + sqlite3_db_filename(db_.handle_, "main") +
+                              "-wal, and the next program to open the host copies it in" +
+                              (full ? " (free space first)" : "")),
+                    FailureOf(db_.copyFailed_), cause);
   }
   db_.depth_ = depth_;
   done_ = true;

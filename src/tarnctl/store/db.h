@@ -63,6 +63,21 @@ class Statement {
   Cached* cached_;
 };
 
+// A database failure: the library's exception, with what kind of failure
+// it was and SQLite's text for it.
+class DbFailure : public HostCtl::Lib::HostCtlException {
+ public:
+  enum class Kind { kNone, kIo, kFull, kPermission, kCorrupt, kNotADatabase, kBusy, kOther };
+  DbFailure(HostCtl::Lib::HostCtlException exception, Kind kind, std::string cause)
+      : HostCtlException(std::move(exception)), kind_(kind), cause_(std::move(cause)) {}
+  Kind kind() const { return kind_; }
+  const std::string& cause() const { return cause_; }
+
+ private:
+  Kind kind_;
+  std::string cause_;
+};
+
 class Db {
  public:
   // How OpenFile opens a file.
@@ -130,7 +145,7 @@ class Db {
   bool InTransaction() const;
 
   // What kind of failure the last failed call of this connection met.
-  enum class Failure { kNone, kIo, kFull, kPermission, kCorrupt, kNotADatabase, kBusy, kOther };
+  using Failure = DbFailure::Kind;
   Failure LastFailure() const;
 
   // Called with the SQL text and context() of every statement a
@@ -141,7 +156,8 @@ class Db {
 
   // The database failure `cause` on this file.
   HostCtl::Lib::HostCtlException Error(const std::string& cause) const;
-  [[noreturn]] void Fail() const;
+  // Throws the last failure as a DbFailure, `more` added to its message.
+  [[noreturn]] void Fail(const std::string& more = "") const;
   // SQLite's text for the last failure, with the reason the system gave
   // when it was an I/O error that SQLite reports as something else.
   std::string Cause() const;
@@ -155,6 +171,7 @@ class Db {
   std::string path_;
   uint64_t serial_;
   uint64_t ioFailuresAtOpen_;  // IoFailures() when it was opened
+  bool readOnly_ = false;      // opened with Access::kRead
   const char* context_ = nullptr;
   int depth_ = 0;
   // The copy of the log into the file after the last commit failed with

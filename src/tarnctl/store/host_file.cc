@@ -101,21 +101,20 @@ HostCtlException CannotOpenErrno(const std::string& path, const std::string& wha
   return CannotOpen(path, what + std::strerror(error), RemedyFor(error));
 }
 
-// The failure `db` met while opening, as what it is.
-HostCtlException CannotOpen(const std::string& path, const Db& db) {
-  switch (db.LastFailure()) {
-    case Db::Failure::kIo:
-      return CannotOpen(path, db.Cause(), kRetry);
+// The failure met while opening, as what it is.
+HostCtlException CannotOpen(const std::string& path, const DbFailure& failure) {
+  const std::string& cause = failure.cause();
+  switch (failure.kind()) {
     case Db::Failure::kFull:
-      return CannotOpen(path, db.Cause(), kFree);
+      return CannotOpen(path, cause, kFree);
     case Db::Failure::kPermission:
-      return CannotOpen(path, db.Cause(), kPermissions);
+      return CannotOpen(path, cause, kPermissions);
     case Db::Failure::kNotADatabase:
-      return CannotOpen(path, "not a host database (" + db.Cause() + ")", kReplace);
+      return CannotOpen(path, "not a host database (" + cause + ")", kReplace);
     case Db::Failure::kCorrupt:
-      return CannotOpen(path, db.Cause(), kDamaged);
+      return CannotOpen(path, cause, kDamaged);
     default:
-      return CannotOpen(path, db.Cause(), kRetry);
+      return CannotOpen(path, cause, kRetry);
   }
 }
 
@@ -313,17 +312,22 @@ int CreateHost(const std::string& path, const std::string& real, struct stat* he
     if (fchown(fd, held->st_uid, held->st_gid) != 0) {
       // Another user's empty file: the new host is this user's.
     }
-    {
-      // The file is thrown away if anything fails: no journal, no syncs
-      // but the one below. Closing it copies its log in and removes it.
+    // The file is thrown away if anything fails: no journal, no syncs but
+    // the one below. Switched to the log's mode last, so that its header
+    // says so from the start (host_vfs.h); closing it leaves no log.
+    try {
       auto db = Db::OpenFile(building, path);
-      try {
-        db->Exec("PRAGMA locking_mode=EXCLUSIVE; PRAGMA journal_mode=OFF; PRAGMA synchronous=OFF");
-        BuildDefaultHost(*db);
-        db->Exec("PRAGMA journal_mode=WAL");
-      } catch (const HostCtlException&) {
-        throw CannotCreate(path, db->Cause(), RemedyFor(EIO));
-      }
+      db->Exec("PRAGMA locking_mode=EXCLUSIVE; PRAGMA journal_mode=OFF; PRAGMA synchronous=OFF");
+      BuildDefaultHost(*db);
+      db->Exec("PRAGMA journal_mode=WAL");
+    } catch (const DbFailure& failure) {
+      throw CannotCreate(path, failure.cause(),
+                         failure.kind() == Db::Failure::kFull ? kFree : kRetry);
+    }
+    off_t leftover = 0;
+    if (Exists(building + "-wal", &leftover)) {
+      unlink((building + "-wal").c_str());
+      if (leftover > 0) throw CannotCreate(path, "the new host's log was not copied in", kRetry);
     }
     if (fdatasync(fd) != 0) throw CannotCreate(path, std::strerror(errno), RemedyFor(errno));
     if (rename(building.c_str(), real.c_str()) != 0) {
@@ -358,11 +362,10 @@ void RollBackCreation(int fd, const std::string& real, const std::string& path) 
     const int32_t applicationId = BigEndian32(header + kApplicationIdOffset);
     if (applicationId != 0 && applicationId != kApplicationId) return;
   }
-  auto db = Db::OpenFile(real, path);
   try {
-    db->Exec("PRAGMA schema_version");
-  } catch (const HostCtlException&) {
-    throw CannotOpen(path, *db);
+    Db::OpenFile(real, path)->Exec("PRAGMA schema_version");
+  } catch (const DbFailure& failure) {
+    throw CannotOpen(path, failure);
   }
 }
 
@@ -386,16 +389,16 @@ std::unique_ptr<Db> Connect(const std::string& real, const std::string& path, He
                        "the host was not changed; run as a user who can write the file, its log "
                        "and its directory");
     }
-    auto db = Db::OpenFile(real, path, Db::Access::kRead);
     try {
+      auto db = Db::OpenFile(real, path, Db::Access::kRead);
       db->Exec("SELECT count(*) FROM sqlite_schema");
-    } catch (const HostCtlException&) {
-      throw CannotOpen(path, *db);
+      return db;
+    } catch (const DbFailure& failure) {
+      throw CannotOpen(path, failure);
     }
-    return db;
   }
-  auto db = Db::OpenFile(real, path);
   try {
+    auto db = Db::OpenFile(real, path);
     // Reading the schema finds a file that is damaged past its header. The
     // first 8 MiB of the file (all of a host of some 60,000 port groups)
     // are read through a mapping rather than a read() a page: a lookup
@@ -404,10 +407,10 @@ std::unique_ptr<Db> Connect(const std::string& real, const std::string& path, He
     db->Exec("PRAGMA mmap_size=8388608");
     db->UseLog(header == Header::kLogged);
     db->Exec("SELECT count(*) FROM sqlite_schema");
-  } catch (const HostCtlException&) {
-    throw CannotOpen(path, *db);
+    return db;
+  } catch (const DbFailure& failure) {
+    throw CannotOpen(path, failure);
   }
-  return db;
 }
 
 // A host whose creation by an older release did not finish: SQLite's
@@ -416,8 +419,8 @@ bool HalfMade(Db& db, const std::string& path) {
   try {
     auto statement = db.Prepare("SELECT 1 FROM sqlite_schema WHERE name = 'meta'");
     return !statement.Step();
-  } catch (const HostCtlException&) {
-    throw CannotOpen(path, db);
+  } catch (const DbFailure& failure) {
+    throw CannotOpen(path, failure);
   }
 }
 
