@@ -28,3 +28,66 @@ A location where nothing can be written:
   $ TARN_HOST_DB=/proc/self/host.db orvocfg-vswitch -l; echo $?
   Cannot create host database /proc/self/host.db: No such file or directory; set TARN_HOST_DB to a file in a writable directory
   1
+
+Failures of the disk say what happened once, whether the change stood, and
+what is safe to do; a host that failed to open is never advised away. A
+failed copy of a commit into the file: the change was made and waits in the
+log, and the next program copies it in (strace fails the system call):
+
+  $ export TARN_HOST_DB=$PWD/host.db; tarnhost init 2> /dev/null
+  $ fail() { local spec=$1; shift; strace -f -o /dev/null -P "$PWD/host.db" -P "$PWD/host.db-wal" -e inject=$spec "$@" 2>&1 | sed "s|$PWD|PWD|g"; echo "status ${PIPESTATUS[0]}"; }
+  $ fail fdatasync:error=EIO:when=1 tarnhost pnic add pnicA
+  tarnhost: Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
+  status 1
+  $ fail fdatasync:error=EIO:when=2 orvocfg-vswitch -a vSwitchA
+  Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
+  status 1
+  $ tarnhost pnic list | grep -c pnicA; orvocfg-vswitch -c vSwitchA; stat -c %s host.db-wal
+  1
+  1
+  0
+  $ fail pwrite64:error=ENOSPC:when=1 orvocfg-vswitch -A pgB vswitch0
+  Host database PWD/host.db: database or disk is full; the change was not made (free space, then run it again)
+  status 1
+  $ fail pwrite64:error=EIO:when=1 tarnhost pnic add pnicB
+  tarnhost: Host database PWD/host.db: disk I/O error; the change was not made
+  status 1
+  $ fail openat:error=EIO:when=2 orvocfg-vswitch -l
+  Cannot open host database PWD/host.db: disk I/O error; the host was not changed; try again, and check the disk if it fails again
+  status 1
+  $ fail flock:error=EIO:when=1 tarnhost dump
+  tarnhost: Cannot open host database PWD/host.db: cannot lock it: Input/output error; the host was not changed; try again, and check the disk if it fails again
+  status 1
+  $ ls host.db*; orvocfg-vswitch -l | grep -c pgB
+  host.db
+  host.db-wal
+  0
+  [1]
+
+A host this user cannot write is read as it is (here as another user, in a
+directory only root writes), and a change to it says why it cannot be made:
+
+  $ mkdir ro; TARN_HOST_DB=$PWD/ro/host.db tarnhost init 2> /dev/null; chmod 444 ro/host.db; chmod 555 ro
+  $ export TARN_HOST_DB=$PWD/ro/host.db; chmod o+x .. .; mkdir bin
+  $ cp "$(command -v orvocfg-vswitch)" "$(command -v tarnhost)" bin/
+  $ as() { setpriv --reuid=65534 --regid=65534 --clear-groups "bin/$@" 2>&1 | sed "s|$PWD|PWD|g"; }
+  $ as orvocfg-vswitch -c vswitch0; as tarnhost dump | grep -c "\"name\": \"pnic0\""
+  1
+  1
+  $ as orvocfg-vswitch -a vSwitchR; ls -A ro
+  Failed to add vswitch: vSwitchR, Error: Host database PWD/ro/host.db: this user can only read it (the file, its log or their directory is not writable)
+  host.db
+  host.db-wal
+
+A creation is all or nothing: the new host is built beside the file and
+renamed into place, so a file that a killed creation left is no host yet and
+is made again; a log beside a missing file is another host's, and is kept:
+
+  $ cd ro; chmod 755 .; cd ..; export TARN_HOST_DB=$PWD/new.db
+  $ : > new.db; echo partial > new.db.new; tarnhost init 2>&1 | sed "s|$PWD|PWD|"; ls new.db*
+  created a new default host at PWD/new.db
+  new.db
+  new.db-wal
+  $ cp host.db moved.db; printf 'frames' > moved.db-wal; rm moved.db; TARN_HOST_DB=$PWD/moved.db tarnhost init 2>&1 | sed "s|$PWD|PWD|g"; cat moved.db-wal; echo
+  tarnhost: Cannot create host database PWD/moved.db: PWD/moved.db-wal holds changes of a host file that is not there (moved away without its log?); move the log to the host file it belongs to; nothing was changed
+  frames
