@@ -197,10 +197,11 @@ def main():
         ci = {"-A": ["write", "sync"], "client add": ["write", "sync"], "init missing": ["write"]}
         plan = [(c, [call for g in ci[c[0]] for call in GROUPS[g]]) for c in chosen if c[0] in ci]
 
-    jobs, fixtures = [], []
+    jobs, setup = [], []
     for i, ((name, argv, steps, input_file), calls) in enumerate(plan):
         fx = Fixture(host, host.work, i, name, argv, steps, input_file)
-        fixtures.append(fx)
+        if (fx.before == fx.after) != (name == "-l"):
+            setup.append(f"{name}: run normally, it {'changed' if name == '-l' else 'kept'} the host")
         counts = fx.count(host.work, calls)
         for call in calls:
             n = counts[call]
@@ -228,7 +229,7 @@ def main():
     unopened = sum(1 for r in kills if r[5].startswith("does not open"))
     lines.append(f"\n{len(results)} runs; tarnhost init on a missing file: {len(kills)} kill "
                  f"points, {unopened} of them left a host that does not open")
-    host.finish("\n".join(lines), firsts + others)
+    host.finish("\n".join(lines), setup + firsts + others)
 
 
 if __name__ == "__main__":
