@@ -5,13 +5,17 @@ Each command gets a host prepared for it. One run under strace counts the
 command's calls of each kind; then, for each occurrence N of a call, the
 command runs again on a fresh copy of the prepared host with that occurrence
 failing (EIO; ENOSPC too for writes) or with the process killed on it
-(writes and syncs). Opens, reads, stats and writes are counted and hit only
-on the host's files (the file, its log and journal, its directory, and the
-command's input file), so that neither the loader's files nor standard
-error are. After each run another program must open the host, sqlite3 must
-find it intact, and it must be exactly the host before or after the command;
-status 0 means after; a failure says what in one line, and nothing tells the
-user to move a good host away.
+(writes and syncs). Opens, reads, stats and write() are counted and hit
+only on the host's files (the file, its log and journal, its directory, and
+the command's input file), so that neither the loader's files nor standard
+error are; pwrite64, syncs, truncates and locks, made on files only, are hit
+wherever they go (SQLite's temporary files too). After each run another
+program must open the host, sqlite3 must find it intact, and it must be
+exactly the host before or after the command; status 0 means after; a
+failure says what in one line, and nothing tells the user to move a good
+host away. A run is clean (before, status not 0), a success (after, 0),
+committed (after, not 0), lost (before, 0), corrupt (does not open, not
+intact, or neither host) or unclear (its message); the last three fail.
 
 usage: faults.py BIN_DIR [--full] [--every K]
   default: every write and sync of -A and client add, every write of
