@@ -4,8 +4,8 @@
 set -euo pipefail
 packages=(cmake g++ make pkg-config libsqlite3-dev sqlite3 nlohmann-json3-dev libsimdjson-dev
           libgtest-dev libgmock-dev python3-cram man-db groff-base dpkg-dev
-          graphviz jq lintian)
-[ "${1:-}" != --bench ] || packages+=(valgrind strace time)
+          graphviz jq lintian strace)
+[ "${1:-}" != --bench ] || packages+=(valgrind time)
 missing=()
 for p in "${packages[@]}"; do
   dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q 'install ok installed' || missing+=("$p")
