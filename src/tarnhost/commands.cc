@@ -149,7 +149,16 @@ int Reboot(const Args&) {
 }
 
 int Path(const Args&) {
-  return Print(TarnCtl::Admin::HostPath() + "\n");
+  const std::string path = TarnCtl::Admin::HostPath();
+  const std::string log = TarnCtl::Admin::WaitingLog(path);
+  if (!log.empty()) {
+    // Standard error: standard output stays the path alone, for scripts.
+    std::fprintf(stderr,
+                 "tarnhost: a commit waits in %s; copy the file together with it, or let any "
+                 "program open the host first, which copies it in\n",
+                 log.c_str());
+  }
+  return Print(path + "\n");
 }
 
 int AddPnic(const Args& args) {

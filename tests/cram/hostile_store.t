@@ -42,10 +42,14 @@ log, and the next program copies it in (strace fails the system call):
   $ fail fdatasync:error=EIO:when=2 orvocfg-vswitch -a vSwitchA
   Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
   status 1
-  $ tarnhost pnic list | grep -c pnicA; orvocfg-vswitch -c vSwitchA; stat -c %s host.db-wal
+  $ tarnhost path 2>&1 | sed "s|$PWD|PWD|g"
+  tarnhost: a commit waits in PWD/host.db-wal; copy the file together with it, or let any program open the host first, which copies it in
+  PWD/host.db
+  $ tarnhost pnic list | grep -c pnicA; orvocfg-vswitch -c vSwitchA; stat -c %s host.db-wal; tarnhost path 2>&1 | sed "s|$PWD|PWD|g"
   1
   1
   0
+  PWD/host.db
   $ fail pwrite64:error=ENOSPC:when=1 orvocfg-vswitch -A pgB vswitch0
   Host database PWD/host.db: database or disk is full; the change was not made (free space, then run it again)
   status 1

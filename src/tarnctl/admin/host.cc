@@ -10,6 +10,7 @@
 #include "tarnctl/model/limits.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/store/faults.h"
+#include "tarnctl/store/host_file.h"
 #include "tarnctl/store/reset.h"
 #include "tarnctl/store/transaction.h"
 
@@ -33,6 +34,10 @@ std::string Reason(const HostCtl::Lib::HostCtlException& refusal) {
 
 std::string HostPath() {
   return Api::Session::DefaultLocation().path;
+}
+
+std::string WaitingLog(const std::string& path) {
+  return Store::WaitingLog(path);
 }
 
 std::vector<OperationInfo> LibraryOperations() {

@@ -58,6 +58,9 @@ std::string Reason(const HostCtl::Lib::HostCtlException& refusal);
 // The host file that Host() opens, as the environment names it; refuses a
 // mistaken name (TARN_HOST_DB starting with "~").
 std::string HostPath();
+// The log beside the host file at `path` when a commit waits there to be
+// copied into the file; empty when none does.
+std::string WaitingLog(const std::string& path);
 
 // An operation of the host control library, for arming faults.
 struct OperationInfo {

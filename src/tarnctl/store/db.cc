@@ -6,8 +6,8 @@
 #include <sys/stat.h>
 
 #include <atomic>
-#include <cstdio>
 #include <cassert>
+#include <cstdio>
 #include <string_view>
 #include <unordered_map>
 

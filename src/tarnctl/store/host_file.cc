@@ -426,6 +426,14 @@ bool HalfMade(Db& db, const std::string& path) {
 
 }  // namespace
 
+std::string WaitingLog(const std::string& path) {
+  char resolved[PATH_MAX];
+  if (realpath(path.c_str(), resolved) == nullptr) return "";
+  const std::string log = std::string(resolved) + "-wal";
+  off_t size = 0;
+  return Exists(log, &size) && size > 0 ? log : "";
+}
+
 int LockTimeoutFrom(const char* text) {
   if (text == nullptr || *text == '\0') return kDefaultLockTimeoutSeconds;
   char* end = nullptr;

@@ -35,6 +35,12 @@ struct OpenOptions {
   bool create = true;
 };
 
+// The log beside the host file `path` when a commit waits there to be
+// copied into the file (a copy failed, or a run was killed after its
+// commit); empty when none does. Reads only the log's size: a run that is
+// committing right now has one there for a moment.
+std::string WaitingLog(const std::string& path);
+
 // TARN_LOCK_TIMEOUT's value as seconds (0 to 86400); the default for
 // anything else.
 int LockTimeoutFrom(const char* text);
