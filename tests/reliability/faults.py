@@ -166,6 +166,7 @@ class Fixture:
         state, why = self.state(db)
         killed = r.returncode < 0
         lines = [l for l in r.stderr.splitlines() if not CREATED.match(l)]
+        created = len(lines) < len(r.stderr.splitlines())  # then the change is the creation
         if state is None:
             result = ("corrupt", why)
         elif state != self.after and state != self.before:
@@ -173,7 +174,12 @@ class Fixture:
         elif r.returncode == 0 and state != self.after:
             result = ("lost", "status 0 but the host is the one before")
         elif not killed and (len(lines) != (r.returncode != 0) or any(
-                "no transaction is active" in l or "move it away" in l for l in lines)):
+                "no transaction is active" in l or "move it away" in l or "malformed" in l
+                # what a message says of the change must be what happened
+                or ("change was made" in l and state != self.after)
+                or ("change was not made" in l and state == self.after != self.before
+                    and not created)
+                for l in lines)):
             result = ("unclear", f"status {r.returncode}, stderr {r.stderr.strip()!r}")
         elif state == self.after and (state != self.before or r.returncode == 0):
             result = ("success" if r.returncode == 0 else "committed", "")

@@ -2,6 +2,7 @@
 // trace file.
 #include <sys/stat.h>
 
+#include <fstream>
 #include <sstream>
 
 #include "scratch.h"
@@ -75,6 +76,13 @@ TEST_F(TraceTest, ABadTraceFileTurnsTheTraceOff) {
   ConfigureTrace(nullptr);
   EXPECT_EQ(ReadFile(Path("trace")),
             "GetVlanId() on pg\\nRemovePortGroup(\\\"x\\\") on vswitch0\n");
+  // A line that a full disk cut short is not glued to the next program's.
+  std::ofstream(Path("cut")) << "Networ";
+  ConfigureTrace(Path("cut").c_str());
+  WriteTraceLine("Refresh()");
+  WriteTraceLine("Refresh()");
+  ConfigureTrace(nullptr);
+  EXPECT_EQ(ReadFile(Path("cut")), "Networ\nRefresh()\nRefresh()\n");
 }
 
 }  // namespace
