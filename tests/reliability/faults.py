@@ -18,8 +18,8 @@ committed (after, not 0), lost (before, 0), corrupt (does not open, not
 intact, or neither host) or unclear (its message); the last three fail.
 
 usage: faults.py BIN_DIR [--full] [--every K]
-  default: every write and sync of -A and client add, every write of
-           tarnhost init on a missing file
+  default: every write and sync of -A and client add, every stat of -A,
+           every write of tarnhost init on a missing file
   --full:  every command, every call, every fault
   --every K: only occurrences 1, 1+K, 1+2K, ... and the last
 """
@@ -204,7 +204,8 @@ def main():
     if args.full:
         plan = [(c, list(GROUP_OF)) for c in chosen]
     else:
-        ci = {"-A": ["write", "sync"], "client add": ["write", "sync"], "init missing": ["write"]}
+        ci = {"-A": ["write", "sync", "stat"], "client add": ["write", "sync"],
+              "init missing": ["write"]}
         plan = [(c, [call for g in ci[c[0]] for call in GROUPS[g]]) for c in chosen if c[0] in ci]
 
     jobs, setup = [], []
