@@ -40,7 +40,7 @@ checks cannot run under it):
   $ fail fdatasync:error=EIO:when=1 tarnhost pnic add pnicA
   tarnhost: Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
   status 1
-  $ fail fdatasync:error=EIO:when=2 orvocfg-vswitch -a vSwitchA
+  $ fail fdatasync:error=EIO:when=4 orvocfg-vswitch -a vSwitchA
   Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
   status 1
   $ tarnhost path 2>&1 | sed "s|$PWD|PWD|g"

@@ -255,6 +255,10 @@ void Db::UseLog(bool logged) {
       [](void* self, sqlite3* handle, const char*, int) {
         const int rc = CopyLogIn(handle);
         static_cast<Db*>(self)->copyFailed_ = rc;
+        // The change stays in the log for the next program, which says so:
+        // not copied at close by a disk that just failed a sync.
+        if (rc != SQLITE_OK)
+          sqlite3_db_config(handle, SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr);
         return rc;
       },
       this);
