@@ -45,8 +45,13 @@ void ConfigureOnce() {
 }
 
 // Copies the write-ahead log into the file, syncing both, and empties it.
+// A copy that fails leaves the log as it is for the next program, which
+// copies it in: not copied at close, after a sync that just failed.
 int CopyLogIn(sqlite3* handle) {
-  return sqlite3_wal_checkpoint_v2(handle, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr);
+  const int rc =
+      sqlite3_wal_checkpoint_v2(handle, nullptr, SQLITE_CHECKPOINT_TRUNCATE, nullptr, nullptr);
+  if (rc != SQLITE_OK) sqlite3_db_config(handle, SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr);
+  return rc;
 }
 
 Db::Failure FailureOf(int code) {
@@ -255,10 +260,6 @@ void Db::UseLog(bool logged) {
       [](void* self, sqlite3* handle, const char*, int) {
         const int rc = CopyLogIn(handle);
         static_cast<Db*>(self)->copyFailed_ = rc;
-        // The change stays in the log for the next program, which says so:
-        // not copied at close by a disk that just failed a sync.
-        if (rc != SQLITE_OK)
-          sqlite3_db_config(handle, SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr);
         return rc;
       },
       this);
