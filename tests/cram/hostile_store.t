@@ -104,6 +104,8 @@ is made again; a log beside a missing file is another host's, and is kept:
   $ cp host.db moved.db; printf 'frames' > moved.db-wal; rm moved.db; TARN_HOST_DB=$PWD/moved.db tarnhost init 2>&1 | sed "s|$PWD|PWD|g"; cat moved.db-wal; echo
   tarnhost: Cannot create host database PWD/moved.db: PWD/moved.db-wal holds changes of a host file that is not there (moved away without its log?); move the log to the host file it belongs to; nothing was changed
   frames
+  $ ASAN_OPTIONS=detect_leaks=0 TARN_HOST_DB=$PWD/full.db strace -o /dev/null -P "$PWD/full.db" -e inject=openat:error=ENOSPC:when=2 tarnhost init 2>&1 | sed "s|$PWD|PWD|g"
+  tarnhost: Cannot create host database PWD/full.db: No space left on device; the host was not changed; free space on its disk and try again
   $ sqlite3 half.db "PRAGMA application_id=$((0x54524e48)); PRAGMA user_version=1; CREATE TABLE pnic(x)"
   $ TARN_HOST_DB=$PWD/half.db orvocfg-vswitch -c vswitch0 2>&1 | sed "s|$PWD|PWD|g"
   created a new default host at PWD/half.db

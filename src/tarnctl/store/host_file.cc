@@ -166,7 +166,9 @@ int OpenForLock(const std::string& path, bool create) {
   if (!create) throw CannotOpen(path, "no host yet", kInit);
   PrepareDirectory(path);
   fd = OpenRetried(path.c_str(), O_RDONLY | O_CREAT | O_CLOEXEC | O_NOCTTY, 0644);
-  if (fd < 0) throw CannotCreate(path, std::strerror(errno));
+  if (fd < 0) {
+    throw CannotCreate(path, std::strerror(errno), RemedyFor(errno) == kFree ? kFree : kWritable);
+  }
   return fd;
 }
 
