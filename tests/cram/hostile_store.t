@@ -68,6 +68,9 @@ later, and reading goes on through the log:
   $ fail openat:error=EIO:when=2 orvocfg-vswitch -l
   Cannot open host database PWD/host.db: disk I/O error; the host was not changed; try again, and check the disk if it fails again
   status 1
+  $ fail openat:error=EIO:when=3 orvocfg-vswitch -a vSwitchC
+  Cannot open host database PWD/host.db: disk I/O error; the host was not changed; try again, and check the disk if it fails again
+  status 1
   $ fail flock:error=EIO:when=1 tarnhost dump
   tarnhost: Cannot open host database PWD/host.db: cannot lock it: Input/output error; the host was not changed; try again, and check the disk if it fails again
   status 1
