@@ -19,7 +19,7 @@ intact, or neither host) or unclear (its message); the last three fail.
 
 usage: faults.py BIN_DIR [--full] [--every K]
   default: every write and sync of -A and client add, every stat of -A,
-           every write of tarnhost init on a missing file
+           every write and read of tarnhost init on a missing file
   --full:  every command, every call, every fault
   --every K: only occurrences 1, 1+K, 1+2K, ... and the last
 """
@@ -205,7 +205,7 @@ def main():
         plan = [(c, list(GROUP_OF)) for c in chosen]
     else:
         ci = {"-A": ["write", "sync", "stat"], "client add": ["write", "sync"],
-              "init missing": ["write"]}
+              "init missing": ["write", "read"]}
         plan = [(c, [call for g in ci[c[0]] for call in GROUPS[g]]) for c in chosen if c[0] in ci]
 
     jobs, setup = [], []
