@@ -9,6 +9,7 @@
 #include "tarnctl/instrument/operations.h"
 #include "tarnctl/model/limits.h"
 #include "tarnctl/model/names.h"
+#include "tarnctl/store/db.h"
 #include "tarnctl/store/faults.h"
 #include "tarnctl/store/host_file.h"
 #include "tarnctl/store/reset.h"
@@ -20,16 +21,15 @@ using Instrument::Refused;
 using Instrument::Scope;
 using Store::Transaction;
 
-std::string Reason(const HostCtl::Lib::HostCtlException& refusal) {
-  // Refused() writes "<operation>: <message>[ <where>]"; other failures
-  // (the host file's, a dump's) carry their whole text in both.
-  const std::string& message = refusal.GetMessage();
-  const std::string detail = refusal.GetDetailedMessage();
-  const auto colon = detail.find(": ");
-  if (colon != std::string::npos && detail.compare(colon + 2, message.size(), message) == 0) {
-    return detail.substr(colon + 2);
+std::string Reason(const HostCtl::Lib::HostCtlException& failure) {
+  if (const auto* refusal = dynamic_cast<const Instrument::Refusal*>(&failure)) {
+    return refusal->explanation();
   }
-  return detail.empty() ? message : detail;
+  // A database's failure names the file in its message; the operation that
+  // ran adds nothing for people.
+  if (dynamic_cast<const Store::DbError*>(&failure) != nullptr) return failure.GetMessage();
+  const std::string detail = failure.GetDetailedMessage();
+  return detail.empty() ? failure.GetMessage() : detail;
 }
 
 std::string HostPath() {

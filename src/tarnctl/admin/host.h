@@ -50,10 +50,11 @@ struct FaultSeed {
   int64_t times = 1;
 };
 
-// A refusal as people read it: its reason with the explanation, that is
-// the detailed message without the operation's name in front ("Invalid
-// number of ports 4097 (8-4096)"); the message when there is no more.
-std::string Reason(const HostCtl::Lib::HostCtlException& refusal);
+// A failure as people read it: a refusal's explanation, that is its
+// detailed message without the operation's name in front ("Invalid number
+// of ports 4097 (8-4096)"); a database failure's message; another's
+// detailed message, or its message when it has none.
+std::string Reason(const HostCtl::Lib::HostCtlException& failure);
 
 // The host file that Host() opens, as the environment names it; refuses a
 // mistaken name (TARN_HOST_DB starting with "~").

@@ -27,6 +27,7 @@
 #include "tarnctl/admin/host.h"
 #include "tarnctl/admin/state.h"
 #include "tarnctl/instrument/call.h"
+#include "tarnctl/instrument/errors.h"
 #include "tarnctl/model/invariants.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/model/teaming.h"
@@ -45,8 +46,7 @@ using HostCtl::Lib::HostCtlException;
 using Store::Rows::Value;
 
 [[noreturn]] void Bad(const std::string& why) {
-  const std::string message = "Cannot load dump: " + why;
-  throw HostCtlException(message, "Load: " + message);
+  throw Instrument::Refused("Cannot load dump: " + why);
 }
 
 std::string Quote(const std::string& text) {
