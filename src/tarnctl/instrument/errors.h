@@ -19,8 +19,7 @@ namespace TarnCtl::Instrument {
 // is the refusal as people read it.
 class Refusal : public HostCtl::Lib::HostCtlException {
  public:
-  Refusal(const std::string& operation, const std::string& message,
-          const std::string& explanation)
+  Refusal(const std::string& operation, const std::string& message, const std::string& explanation)
       : HostCtlException(message, operation.empty() ? explanation : operation + ": " + explanation),
         operation_(operation),
         explanation_(explanation) {}

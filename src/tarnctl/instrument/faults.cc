@@ -41,7 +41,7 @@ bool Matches(const Store::Faults::Row& row, const char* operation,
 }  // namespace
 
 std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
-                                          std::span<const std::string_view> names) {
+                                 std::span<const std::string_view> names) {
   const auto& rows = Rows(db);
   if (rows.empty()) return std::nullopt;
   const auto row = std::find_if(rows.begin(), rows.end(), [&](const auto& candidate) {
