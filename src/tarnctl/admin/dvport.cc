@@ -76,7 +76,8 @@ void RemoveDVPort(Store::Db& db, const std::string& dvs, const std::string& port
   }
   for (const Layer layer : Store::kBothLayers) {
     const auto sw = FindDVSwitch(db, layer, dvs);
-    for (const auto& uplink : sw ? sw->uplinks : std::vector<Store::Distributed::Uplink>{}) {
+    if (!sw) continue;
+    for (const auto& uplink : sw->uplinks) {
       if (uplink.portId == portId) throw Refused(port + " holds uplink " + uplink.pnic);
     }
   }

@@ -15,8 +15,8 @@
 #include <unordered_map>
 
 #include "tarnctl/admin/dump/catalogue.h"
-#include "tarnctl/admin/whole_host.h"
 #include "tarnctl/admin/text_json.h"
+#include "tarnctl/admin/whole_host.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/store/policy_codec.h"
 
