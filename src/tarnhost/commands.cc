@@ -12,14 +12,24 @@
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
+#include "tarnctl/admin/distributed.h"
+#include "tarnctl/admin/dvport.h"
+#include "tarnctl/admin/faults.h"
 #include "tarnctl/admin/host.h"
+#include "tarnctl/admin/listing.h"
+#include "tarnctl/admin/opaque.h"
+#include "tarnctl/admin/pnic.h"
+#include "tarnctl/admin/standard.h"
+#include "tarnctl/admin/timeouts.h"
+#include "tarnctl/admin/whole_host.h"
 #include "tarnhost/args.h"
 
 namespace TarnHost {
 namespace {
 
-using TarnCtl::Admin::Host;
-using TarnCtl::Admin::Listing;
+namespace Admin = TarnCtl::Admin;
+using Admin::Listing;
+using TarnCtl::Store::Db;
 
 // Runs `body` on the host and commits what it did before the command
 // succeeds: a commit that fails is then this command's failure ("tarnhost:
@@ -27,13 +37,13 @@ using TarnCtl::Admin::Listing;
 // (0 for nothing).
 template <typename Body>
 auto OnHost(Body body) {
-  Host host;
-  if constexpr (std::is_void_v<decltype(body(host))>) {
-    body(host);
+  Admin::Host host;
+  if constexpr (std::is_void_v<decltype(body(host.db()))>) {
+    body(host.db());
     host.Commit();
     return 0;
   } else {
-    auto result = body(host);
+    auto result = body(host.db());
     host.Commit();
     return result;
   }
@@ -52,7 +62,7 @@ class ProgressLine {
   ProgressLine(const ProgressLine&) = delete;
   ProgressLine& operator=(const ProgressLine&) = delete;
 
-  TarnCtl::Admin::Progress Report() {
+  Admin::Progress Report() {
     if (!isatty(STDERR_FILENO)) return nullptr;
     return [this](int64_t done, int64_t total) {
       if (!shown_ && total > 0 && done >= total) return;
@@ -91,7 +101,7 @@ std::string ReadFile(const std::string& path) {
   // read in place (growing it as it comes touches twice its size).
   struct stat info;
   if (fstat(fileno(file), &info) == 0 && S_ISREG(info.st_mode)) {
-    text.reserve(static_cast<size_t>(info.st_size) + TarnCtl::Admin::Host::kLoadRoom);
+    text.reserve(static_cast<size_t>(info.st_size) + Admin::kLoadRoom);
   }
   char buffer[65536];
   size_t n;
@@ -115,7 +125,7 @@ int Print(const std::string& text) {
 }
 
 int Init(const Args& args) {
-  return OnHost([&](Host& host) { host.Init(args.Has("empty")); });
+  return OnHost([&](Db& db) { Admin::Init(db, args.Has("empty")); });
 }
 
 int Show(const Args& args) {
@@ -124,8 +134,8 @@ int Show(const Args& args) {
   std::optional<std::string> name;
   if (!args.Positionals().empty()) name = args.Positional(0);
   if (name && !json) throw UsageError("NAME is shown with --json only");
-  return Print(OnHost([&](Host& host) {
-    return json ? host.ShowJson(name) : dot ? host.ShowDot() : host.Show();
+  return Print(OnHost([&](Db& db) {
+    return json ? Admin::ShowJson(db, name) : dot ? Admin::ShowDot(db) : Admin::Show(db);
   }));
 }
 
@@ -133,7 +143,7 @@ int Dump(const Args&) {
   std::string text;
   {
     ProgressLine progress("dump");
-    text = OnHost([&](Host& host) { return host.Dump(progress.Report()); });
+    text = OnHost([&](Db& db) { return Admin::DumpHost(db, progress.Report()); });
   }
   return Print(text);
 }
@@ -141,16 +151,16 @@ int Dump(const Args&) {
 int Load(const Args& args) {
   const std::string text = ReadFile(args.Positional(0));
   ProgressLine progress("load");
-  return OnHost([&](Host& host) { host.Load(text, progress.Report()); });
+  return OnHost([&](Db& db) { Admin::LoadHost(db, text, progress.Report()); });
 }
 
 int Reboot(const Args&) {
-  return OnHost([](Host& host) { host.Reboot(); });
+  return OnHost([](Db& db) { Admin::Reboot(db); });
 }
 
 int Path(const Args&) {
-  const std::string path = TarnCtl::Admin::HostPath();
-  const std::string log = TarnCtl::Admin::WaitingLog(path);
+  const std::string path = Admin::HostPath();
+  const std::string log = Admin::WaitingLog(path);
   if (!log.empty()) {
     // Standard error: standard output stays the path alone, for scripts.
     std::fprintf(stderr,
@@ -162,120 +172,121 @@ int Path(const Args&) {
 }
 
 int AddPnic(const Args& args) {
-  return OnHost([&](Host& host) { host.AddPnic(args.Positional(0)); });
+  return OnHost([&](Db& db) { Admin::AddPnic(db, args.Positional(0)); });
 }
 
 int AddClient(const Args& args) {
-  return OnHost([&](Host& host) { host.AddClient(args.Positional(0), args.Positional(1)); });
+  return OnHost([&](Db& db) { Admin::AddClient(db, args.Positional(0), args.Positional(1)); });
 }
 
 int AddSystemSwitch(const Args& args) {
   int32_t ports = HostCtl::Network::Portset::DEF_NUM_PORTS;
   if (auto v = args.Value("ports")) ports = ParseInt32(*v, "--ports");
-  return OnHost([&](Host& host) { host.AddSystemSwitch(args.Positional(0), ports); });
+  return OnHost([&](Db& db) { Admin::AddSystemSwitch(db, args.Positional(0), ports); });
 }
 
 int AddDVSwitch(const Args& args) {
-  TarnCtl::Admin::DVSwitchSeed seed;
+  Admin::DVSwitchSeed seed;
   seed.name = args.Positional(0);
   seed.portset = args.Value("portset");
   seed.switchId = args.Value("id");
   if (auto v = args.Value("ports")) seed.ports = ParseInt32(*v, "--ports");
   if (auto v = args.Value("mtu")) seed.mtu = ParseUint32(*v, "--mtu");
   if (auto v = args.Value("uplinks")) seed.uplinks = SplitNames(*v, "--uplinks");
-  return OnHost([&](Host& host) { host.AddDVSwitch(seed); });
+  return OnHost([&](Db& db) { Admin::AddDVSwitch(db, seed); });
 }
 
 int AddDVPort(const Args& args) {
-  TarnCtl::Admin::DVPortSeed seed;
+  Admin::DVPortSeed seed;
   seed.dvs = args.Positional(0);
   seed.portId = args.Positional(1);
   seed.clients = args.Values("client");
   if (auto v = args.Value("connection-id")) seed.connectionId = ParseUint32(*v, "--connection-id");
-  return OnHost([&](Host& host) { host.AddDVPort(seed); });
+  return OnHost([&](Db& db) { Admin::AddDVPort(db, seed); });
 }
 
 int AddOpaque(const Args& args) {
-  TarnCtl::Admin::OpaqueSeed seed;
+  Admin::OpaqueSeed seed;
   seed.name = args.Positional(0);
   seed.portset = args.Value("portset");
   if (auto v = args.Value("ports")) seed.ports = ParseInt32(*v, "--ports");
   if (auto v = args.Value("used")) seed.used = ParseInt32(*v, "--used");
   if (auto v = args.Value("uplinks")) seed.uplinks = SplitNames(*v, "--uplinks");
-  return OnHost([&](Host& host) { host.AddOpaqueSwitch(seed); });
+  return OnHost([&](Db& db) { Admin::AddOpaqueSwitch(db, seed); });
 }
 
 int AddUplinkTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(2), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(3), "TIMEOUT");
-  return OnHost([&](Host& host) {
-    host.AddUplinkTimeout(args.Positional(0), args.Positional(1), lagId, timeout);
+  return OnHost([&](Db& db) {
+    Admin::AddUplinkTimeout(db, args.Positional(0), args.Positional(1), lagId, timeout);
   });
 }
 
 int AddLagTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(1), "LAGID");
   const uint32_t timeout = ParseUint32(args.Positional(2), "TIMEOUT");
-  return OnHost([&](Host& host) { host.AddLagTimeout(args.Positional(0), lagId, timeout); });
+  return OnHost([&](Db& db) { Admin::AddLagTimeout(db, args.Positional(0), lagId, timeout); });
 }
 
 int AddFault(const Args& args) {
-  TarnCtl::Admin::FaultSeed seed;
+  Admin::FaultSeed seed;
   seed.operation = args.Positional(0);
   seed.on = args.Value("on");
   seed.message = args.Value("message");
   seed.detail = args.Value("detail");
   if (auto v = args.Value("skip")) seed.skip = ParseInt64(*v, "--skip");
   if (auto v = args.Value("times")) seed.times = ParseInt64(*v, "--times");
-  return OnHost([&](Host& host) { host.AddFault(seed); });
+  return OnHost([&](Db& db) { Admin::AddFault(db, seed); });
 }
 
 int ClearFaults(const Args&) {
-  return OnHost([](Host& host) { host.ClearFaults(); });
+  return OnHost([](Db& db) { Admin::ClearFaults(db); });
 }
 
 int RemovePnic(const Args& args) {
-  return OnHost([&](Host& host) { host.RemovePnic(args.Positional(0)); });
+  return OnHost([&](Db& db) { Admin::RemovePnic(db, args.Positional(0)); });
 }
 
 int RemoveClient(const Args& args) {
-  return OnHost([&](Host& host) { host.RemoveClient(args.Positional(0), args.Positional(1)); });
+  return OnHost([&](Db& db) { Admin::RemoveClient(db, args.Positional(0), args.Positional(1)); });
 }
 
 int RemoveSystemSwitch(const Args& args) {
-  return OnHost([&](Host& host) { host.RemoveSystemSwitch(args.Positional(0)); });
+  return OnHost([&](Db& db) { Admin::RemoveSystemSwitch(db, args.Positional(0)); });
 }
 
 int RemoveDVSwitch(const Args& args) {
-  return OnHost([&](Host& host) { host.RemoveDVSwitch(args.Positional(0)); });
+  return OnHost([&](Db& db) { Admin::RemoveDVSwitch(db, args.Positional(0)); });
 }
 
 int RemoveDVPort(const Args& args) {
-  return OnHost([&](Host& host) { host.RemoveDVPort(args.Positional(0), args.Positional(1)); });
+  return OnHost([&](Db& db) { Admin::RemoveDVPort(db, args.Positional(0), args.Positional(1)); });
 }
 
 int RemoveOpaque(const Args& args) {
-  return OnHost([&](Host& host) { host.RemoveOpaqueSwitch(args.Positional(0)); });
+  return OnHost([&](Db& db) { Admin::RemoveOpaqueSwitch(db, args.Positional(0)); });
 }
 
 int RemoveUplinkTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(2), "LAGID");
-  return OnHost(
-      [&](Host& host) { host.RemoveUplinkTimeout(args.Positional(0), args.Positional(1), lagId); });
+  return OnHost([&](Db& db) {
+    Admin::RemoveUplinkTimeout(db, args.Positional(0), args.Positional(1), lagId);
+  });
 }
 
 int RemoveLagTimeout(const Args& args) {
   const uint32_t lagId = ParseUint32(args.Positional(1), "LAGID");
-  return OnHost([&](Host& host) { host.RemoveLagTimeout(args.Positional(0), lagId); });
+  return OnHost([&](Db& db) { Admin::RemoveLagTimeout(db, args.Positional(0), lagId); });
 }
 
 int RemoveFault(const Args& args) {
   const int64_t number = ParseInt64(args.Positional(0), "NUMBER");
-  return OnHost([&](Host& host) { host.RemoveFault(number); });
+  return OnHost([&](Db& db) { Admin::RemoveFault(db, number); });
 }
 
 int PrintList(Listing what, const Args& args) {
-  const auto rows = OnHost([&](Host& host) { return host.List(what); });
+  const auto rows = OnHost([&](Db& db) { return Admin::List(db, what); });
   const std::string* only = args.Positionals().empty() ? nullptr : &args.Positional(0);
   std::string text;
   for (const auto& row : rows) {
@@ -286,7 +297,7 @@ int PrintList(Listing what, const Args& args) {
 
 int ListOperations(const Args&) {
   std::string text;
-  for (const auto& operation : TarnCtl::Admin::LibraryOperations()) {
+  for (const auto& operation : Admin::LibraryOperations()) {
     text +=
         Join({operation.name, operation.faultable ? "yes" : "no", operation.target}, "\t") + "\n";
   }

@@ -4,7 +4,7 @@
 // commit) throw HostCtl::Lib::HostCtlException.
 #pragma once
 
-#include "tarnctl/admin/host.h"
+#include "tarnctl/admin/listing.h"
 #include "tarnhost/args.h"
 
 namespace TarnHost {

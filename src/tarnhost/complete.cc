@@ -2,7 +2,8 @@
 
 #include <algorithm>
 
-#include "tarnctl/admin/host.h"
+#include "tarnctl/admin/faults.h"
+#include "tarnctl/admin/listing.h"
 #include "tarnhost/commands.h"
 #include "tarnhost/table.h"
 
@@ -56,7 +57,7 @@ Words Candidates(Kind kind, const Words& given) {
     default:
       for (const auto& host : kHostKinds) {
         if (host.kind == kind) {
-          return TarnCtl::Admin::Host::PeekNames(host.objects, given.empty() ? "" : given.back());
+          return TarnCtl::Admin::PeekNames(host.objects, given.empty() ? "" : given.back());
         }
       }
       return {};
@@ -100,7 +101,7 @@ int Names(const Args& args) {
   Words words;
   for (const auto& host : kHostKinds) {
     if (word == host.word) {
-      const Words names = TarnCtl::Admin::Host::PeekNames(
+      const Words names = TarnCtl::Admin::PeekNames(
           host.objects, args.Positionals().size() > 1 ? args.Positional(1) : "");
       return Print(names.empty() ? "" : Join(names, "\n") + "\n");
     }

@@ -11,7 +11,16 @@
 #include "hostctl/nodi.h"
 #include "hostctl/tarnctl.h"
 #include "scratch.h"
+#include "tarnctl/admin/distributed.h"
+#include "tarnctl/admin/dvport.h"
+#include "tarnctl/admin/faults.h"
 #include "tarnctl/admin/host.h"
+#include "tarnctl/admin/listing.h"
+#include "tarnctl/admin/opaque.h"
+#include "tarnctl/admin/pnic.h"
+#include "tarnctl/admin/standard.h"
+#include "tarnctl/admin/timeouts.h"
+#include "tarnctl/admin/whole_host.h"
 
 namespace HN = HostCtl::Network;
 using HN::NetworkFactory;
@@ -49,7 +58,7 @@ class HostTest : public ScratchTest {
   static std::unique_ptr<HN::DVSwitch> Dvs(const std::string& name) {
     return NetworkFactory::GetDVSwitchByName(name);
   }
-  static void Reboot() { TarnCtl::Admin::Host().Reboot(); }
+  static void Reboot() { TarnCtl::Admin::Reboot(TarnCtl::Admin::Host().db()); }
 
   // The sample host: the default host (vswitch0 on pnic0, port group
   // Management) plus
@@ -61,7 +70,8 @@ class HostTest : public ScratchTest {
   //  - pnic4, free.
   static void SeedSampleHost() {
     TarnCtl::Admin::Host host;
-    host.AddPnic("pnic4");
+    TarnCtl::Store::Db& db = host.db();
+    TarnCtl::Admin::AddPnic(db, "pnic4");
     TarnCtl::Network::VirtualSwitchInfoImpl info;
     auto vs1 = info.AddVirtualSwitch(
         HN::NicTeamingPolicy::GetDefaultPolicy(), HN::PortSecurityPolicy::GetDefaultPolicy(),
@@ -69,12 +79,12 @@ class HostTest : public ScratchTest {
     vs1->AddUplink("pnic1", true);
     vs1->AddPortGroup("pg1");
     vs1->AddPortGroup("pg2");
-    host.AddClient("pg1", "vm-a");
-    host.AddClient("pg1", "vm-b");
-    host.AddDVSwitch({"dvs0", "dvs0-ps", "dvs-dvs0", 128, 1500, {"pnic2"}});
-    host.AddDVPort({"dvs0", "100", {"vm-c"}, 5});
-    host.AddDVPort({"dvs0", "101", {}, 0});
-    host.AddOpaqueSwitch({"op0", "op0-ps", 128, 0, {"pnic3"}});
+    TarnCtl::Admin::AddClient(db, "pg1", "vm-a");
+    TarnCtl::Admin::AddClient(db, "pg1", "vm-b");
+    TarnCtl::Admin::AddDVSwitch(db, {"dvs0", "dvs0-ps", "dvs-dvs0", 128, 1500, {"pnic2"}});
+    TarnCtl::Admin::AddDVPort(db, {"dvs0", "100", {"vm-c"}, 5});
+    TarnCtl::Admin::AddDVPort(db, {"dvs0", "101", {}, 0});
+    TarnCtl::Admin::AddOpaqueSwitch(db, {"op0", "op0-ps", 128, 0, {"pnic3"}});
   }
 
   std::string path_;

@@ -17,9 +17,8 @@
 #include <string>
 #include <vector>
 
-#include "tarnctl/admin/host.h"
 #include "tarnctl/admin/show_json.h"
-#include "tarnctl/admin/state.h"
+#include "tarnctl/admin/whole_host.h"
 
 namespace TarnCtl::Admin {
 namespace {
@@ -236,8 +235,8 @@ void Opaque(Graph& g, const Json& sw) {
 
 }  // namespace
 
-std::string Host::ShowDot() {
-  const Json host = View::WholeHost(state_->db());
+std::string ShowDot(Store::Db& db) {
+  const Json host = View::WholeHost(db);
   Graph g;
   std::string pnics;
   for (const auto& pnic : host["pnics"]) {

@@ -1,23 +1,17 @@
-// Stored timeout records, added and removed as the host's configuration
-// tool would: `orvocfg-vswitch -O` and `-G` load the matching ones.
-#include <string>
+#include "tarnctl/admin/timeouts.h"
 
-#include "tarnctl/admin/host.h"
-#include "tarnctl/admin/state.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/model/limits.h"
 #include "tarnctl/model/names.h"
-#include "tarnctl/store/timeouts.h"
 #include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Admin {
+namespace {
 
 using Instrument::Refused;
 using Instrument::Scope;
 using Store::Layer;
-
-namespace {
 
 // A record by its key, as refusals name it.
 std::string UplinkRecord(const std::string& portset, const std::string& uplink, uint32_t lagId) {
@@ -29,9 +23,12 @@ std::string LagRecord(const std::string& portset, uint32_t lagId) {
 
 }  // namespace
 
-void Host::AddUplinkTimeout(const std::string& portset, const std::string& uplink, uint32_t lagId,
-                            uint32_t timeout) {
-  Store::Db& db = state_->db();
+Timeouts TimeoutsOf(Store::Db& db, Layer layer) {
+  return {Store::Timeouts::Uplinks(db, layer, {}), Store::Timeouts::Lags(db, layer, {})};
+}
+
+void AddUplinkTimeout(Store::Db& db, const std::string& portset, const std::string& uplink,
+                      uint32_t lagId, uint32_t timeout) {
   Scope scope(db, "AddUplinkTimeout");
   Model::CheckName(Model::NameKind::kPortset, portset);
   Model::CheckName(Model::NameKind::kUplink, uplink);
@@ -43,8 +40,7 @@ void Host::AddUplinkTimeout(const std::string& portset, const std::string& uplin
   transaction.Commit();
 }
 
-void Host::AddLagTimeout(const std::string& portset, uint32_t lagId, uint32_t timeout) {
-  Store::Db& db = state_->db();
+void AddLagTimeout(Store::Db& db, const std::string& portset, uint32_t lagId, uint32_t timeout) {
   Scope scope(db, "AddLagTimeout");
   Model::CheckName(Model::NameKind::kPortset, portset);
   Model::Check(Model::kTimeout, timeout);
@@ -55,9 +51,8 @@ void Host::AddLagTimeout(const std::string& portset, uint32_t lagId, uint32_t ti
   transaction.Commit();
 }
 
-void Host::RemoveUplinkTimeout(const std::string& portset, const std::string& uplink,
-                               uint32_t lagId) {
-  Store::Db& db = state_->db();
+void RemoveUplinkTimeout(Store::Db& db, const std::string& portset, const std::string& uplink,
+                         uint32_t lagId) {
   Scope scope(db, "RemoveUplinkTimeout");
   Store::Transaction transaction(db);
   if (!Store::Timeouts::DeleteUplink(db, Layer::kStored, {portset, uplink, lagId, 0})) {
@@ -66,14 +61,54 @@ void Host::RemoveUplinkTimeout(const std::string& portset, const std::string& up
   transaction.Commit();
 }
 
-void Host::RemoveLagTimeout(const std::string& portset, uint32_t lagId) {
-  Store::Db& db = state_->db();
+void RemoveLagTimeout(Store::Db& db, const std::string& portset, uint32_t lagId) {
   Scope scope(db, "RemoveLagTimeout");
   Store::Transaction transaction(db);
   if (!Store::Timeouts::DeleteLag(db, Layer::kStored, {portset, lagId, 0})) {
     throw Refused("No " + LagRecord(portset, lagId) + " is stored");
   }
   transaction.Commit();
+}
+
+std::vector<ListRow> ListTimeouts(Store::Db& db) {
+  const Timeouts stored = TimeoutsOf(db, Layer::kStored);
+  std::vector<ListRow> rows;
+  for (const auto& r : stored.uplinks) {
+    rows.push_back({"uplink", r.portsetName, r.uplinkName, std::to_string(r.lagId),
+                    std::to_string(r.timeout)});
+  }
+  for (const auto& r : stored.lags) {
+    rows.push_back({"lag", r.portsetName, "", std::to_string(r.lagId), std::to_string(r.timeout)});
+  }
+  return rows;
+}
+
+std::string TimeoutsText(const Timeouts& timeouts) {
+  std::vector<std::string> uplinks, lags;
+  for (const auto& r : timeouts.uplinks) {
+    uplinks.push_back(r.portsetName + " " + r.uplinkName + " LAG " + std::to_string(r.lagId) +
+                      ": " + std::to_string(r.timeout));
+  }
+  for (const auto& r : timeouts.lags) {
+    lags.push_back(r.portsetName + " LAG " + std::to_string(r.lagId) + ": " +
+                   std::to_string(r.timeout));
+  }
+  return "  Uplink timeouts: " + Listed(uplinks) + "\n  LAG timeouts: " + Listed(lags) + "\n";
+}
+
+void AddTimeoutsJson(const Timeouts& timeouts, Json& into) {
+  Json uplinks = Json::array(), lags = Json::array();
+  for (const auto& r : timeouts.uplinks) {
+    uplinks.push_back({{"portset", r.portsetName},
+                       {"uplink", r.uplinkName},
+                       {"lagId", r.lagId},
+                       {"timeout", r.timeout}});
+  }
+  for (const auto& r : timeouts.lags) {
+    lags.push_back({{"portset", r.portsetName}, {"lagId", r.lagId}, {"timeout", r.timeout}});
+  }
+  into["uplinkTimeouts"] = std::move(uplinks);
+  into["lagTimeouts"] = std::move(lags);
 }
 
 }  // namespace TarnCtl::Admin

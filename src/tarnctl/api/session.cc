@@ -27,7 +27,8 @@ Process& This() {
 
 }  // namespace
 
-Session::Session(std::unique_ptr<Store::HostFile> host) : host_(std::move(host)) {
+Session::Session(Store::Location location, std::unique_ptr<Store::HostFile> host)
+    : location_(std::move(location)), host_(std::move(host)) {
   run_.emplace(host_->db());
 }
 
@@ -85,9 +86,20 @@ std::shared_ptr<Session> Session::Acquire() {
                    {Store::LockTimeoutFrom(std::getenv("TARN_LOCK_TIMEOUT")), true});
 }
 
+std::shared_ptr<Session> Session::Open(const Store::Location& location,
+                                       const Store::OpenOptions& options) {
+  return std::shared_ptr<Session>(new Session(location, Store::HostFile::Open(location, options)));
+}
+
 std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
                                             const Store::OpenOptions& options) {
-  if (auto current = Current()) return current;
+  if (auto current = Current()) {
+    const Store::Location& open = current->location_;
+    if (open.kind == location.kind && open.path == location.path) return current;
+    throw HostCtlException("Host " + open.path + " is open already",
+                           "Host " + open.path + " is open already: " + location.path +
+                               " cannot be this process's host as well");
+  }
   Process& process = This();
   if (process.owner != 0 && process.owner != getpid()) {
     // A forked child's copy of its parent's session stays untouched: its
@@ -101,7 +113,7 @@ std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
     std::fprintf(stderr, "created a new default host at %s\n", host->path().c_str());
     std::fflush(stderr);
   }
-  std::shared_ptr<Session> session(new Session(std::move(host)));
+  std::shared_ptr<Session> session(new Session(location, std::move(host)));
   process.session = session;
   process.owner = getpid();
   static const bool registered = [] {

@@ -2,10 +2,11 @@
 // the run's transaction.
 //
 // Contracts:
-//  - One Session per process at a time. Acquire() opens it on first use at
+//  - One process's session at a time. Acquire() opens it on first use at
 //    the location the environment names (TARN_HOST_DB and friends, read
 //    here, at the library's edge; TARN_LOCK_TIMEOUT likewise) and hands out
-//    shared references; it ends when the last reference goes.
+//    shared references; it ends when the last reference goes. Other hosts
+//    may be open beside it, each a session of its own (Open()).
 //  - A session is one transaction. Everything changed through it is
 //    committed when it ends, or when the process exits through exit() while
 //    it is open; nothing is when the process dies otherwise (killed,
@@ -33,10 +34,17 @@ class Session {
   static std::shared_ptr<Session> Acquire();
   // The open session, or nullptr.
   static std::shared_ptr<Session> Current();
-  // Opens the process's session at `location` with `options` (tarnhost's
-  // completion asks for no wait and no creation).
+  // Opens the process's session at `location` with `options`; the open
+  // one when it is at `location`. Refuses another location while one is
+  // open.
   static std::shared_ptr<Session> AcquireAt(const Store::Location& location,
                                             const Store::OpenOptions& options);
+  // A session of its own at `location`, not the process's: Current() and
+  // Acquire() do not hand it out, and an exit does not commit it. It
+  // commits when it goes, as the process's does, and says nothing of a
+  // host it made.
+  static std::shared_ptr<Session> Open(const Store::Location& location,
+                                       const Store::OpenOptions& options);
   // Makes Acquire() open `location` instead of the environment's (tests);
   // nullopt goes back to the environment.
   static void UseLocation(std::optional<Store::Location> location);
@@ -55,12 +63,13 @@ class Session {
   void Commit();
 
  private:
-  explicit Session(std::unique_ptr<Store::HostFile> host);
+  Session(Store::Location location, std::unique_ptr<Store::HostFile> host);
   // Commits the run for good; a failure is reported on standard error and
   // ends the process with status 1 (the message says whether the change
   // stood). A run that SQLite already ended after a failure is left alone.
   void End() noexcept;
 
+  Store::Location location_;
   std::unique_ptr<Store::HostFile> host_;
   std::optional<Store::Transaction> run_;
 };

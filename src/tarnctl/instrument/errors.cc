@@ -4,11 +4,10 @@
 
 namespace TarnCtl::Instrument {
 
-HostCtl::Lib::HostCtlException Refused(const std::string& message, const std::string& where) {
+Refusal Refused(const std::string& message, const std::string& where) {
   const char* operation = Call::Running();
-  return HostCtl::Lib::HostCtlException(
-      message, std::string(operation != nullptr ? operation : "HostCtl") + ": " + message +
-                   (where.empty() ? "" : " " + where));
+  return Refusal(operation != nullptr ? operation : "HostCtl", message,
+                 where.empty() ? message : message + " " + where);
 }
 
 }  // namespace TarnCtl::Instrument

@@ -14,9 +14,26 @@
 
 namespace TarnCtl::Instrument {
 
+// A refusal, with the parts of its detailed message: the operation's name
+// (empty when none leads it) and the explanation that follows it, which
+// is the refusal as people read it.
+class Refusal : public HostCtl::Lib::HostCtlException {
+ public:
+  Refusal(const std::string& operation, const std::string& message, const std::string& explanation)
+      : HostCtlException(message, operation.empty() ? explanation : operation + ": " + explanation),
+        operation_(operation),
+        explanation_(explanation) {}
+  const std::string& operation() const { return operation_; }
+  const std::string& explanation() const { return explanation_; }
+
+ private:
+  std::string operation_;
+  std::string explanation_;
+};
+
 // A refusal of the operation that is running (Call or Scope): message
 // `message`, detailed message "<operation>: <message>" followed by
 // " <where>" when `where` is not empty.
-HostCtl::Lib::HostCtlException Refused(const std::string& message, const std::string& where = "");
+Refusal Refused(const std::string& message, const std::string& where = "");
 
 }  // namespace TarnCtl::Instrument

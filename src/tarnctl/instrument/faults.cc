@@ -2,13 +2,12 @@
 
 #include <algorithm>
 
+#include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/db.h"
 #include "tarnctl/store/faults.h"
 #include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Instrument {
-
-using HostCtl::Lib::HostCtlException;
 
 namespace {
 
@@ -41,8 +40,8 @@ bool Matches(const Store::Faults::Row& row, const char* operation,
 
 }  // namespace
 
-std::optional<HostCtlException> TakeFault(Store::Db& db, const char* operation,
-                                          std::span<const std::string_view> names) {
+std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
+                                 std::span<const std::string_view> names) {
   const auto& rows = Rows(db);
   if (rows.empty()) return std::nullopt;
   const auto row = std::find_if(rows.begin(), rows.end(), [&](const auto& candidate) {
@@ -64,9 +63,10 @@ std::optional<HostCtlException> TakeFault(Store::Db& db, const char* operation,
   if (!fails) return std::nullopt;
   const std::string message =
       fault.message.empty() ? "Injected failure of " + std::string(operation) : fault.message;
-  const std::string detail =
-      fault.detail.empty() ? std::string(operation) + ": " + message : fault.detail;
-  return HostCtlException(message, detail);
+  // A detail of the fault's own is the whole detailed message: no
+  // operation's name leads it.
+  if (!fault.detail.empty()) return Refusal("", message, fault.detail);
+  return Refusal(operation, message, message);
 }
 
 }  // namespace TarnCtl::Instrument

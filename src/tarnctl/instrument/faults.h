@@ -20,7 +20,7 @@
 #include <string_view>
 #include <vector>
 
-#include "hostctl/exception.h"
+#include "tarnctl/instrument/errors.h"
 
 namespace TarnCtl::Store {
 class Db;
@@ -29,7 +29,7 @@ class Db;
 namespace TarnCtl::Instrument {
 
 // The failure a fault imposes on this call, or nothing.
-std::optional<HostCtl::Lib::HostCtlException> TakeFault(Store::Db& db, const char* operation,
-                                                        std::span<const std::string_view> names);
+std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
+                                 std::span<const std::string_view> names);
 
 }  // namespace TarnCtl::Instrument

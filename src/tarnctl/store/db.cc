@@ -345,10 +345,8 @@ int64_t Db::LastChanges() const {
   return sqlite3_changes64(handle_);
 }
 
-HostCtlException Db::Error(const std::string& cause) const {
-  const std::string message = "Host database " + path_ + ": " + cause;
-  return HostCtlException(message,
-                          context_ != nullptr ? std::string(context_) + ": " + message : message);
+DbError Db::Error(const std::string& cause) const {
+  return DbError(context_ != nullptr ? context_ : "", "Host database " + path_ + ": " + cause);
 }
 
 void Db::Fail(const std::string& more) const {

@@ -63,13 +63,27 @@ class Statement {
   Cached* cached_;
 };
 
-// A database failure: the library's exception, with what kind of failure
-// it was and SQLite's text for it.
-class DbFailure : public HostCtl::Lib::HostCtlException {
+// An error of the database: the library's exception, with the operation
+// that was running (empty when none was), whose name leads the detailed
+// message and never the message.
+class DbError : public HostCtl::Lib::HostCtlException {
+ public:
+  DbError(const std::string& operation, const std::string& message)
+      : HostCtlException(message, operation.empty() ? message : operation + ": " + message),
+        operation_(operation) {}
+  const std::string& operation() const { return operation_; }
+
+ private:
+  std::string operation_;
+};
+
+// A database failure: a DbError with what kind of failure it was and
+// SQLite's text for it.
+class DbFailure : public DbError {
  public:
   enum class Kind { kNone, kIo, kFull, kPermission, kCorrupt, kNotADatabase, kBusy, kOther };
-  DbFailure(HostCtl::Lib::HostCtlException exception, Kind kind, std::string cause)
-      : HostCtlException(std::move(exception)), kind_(kind), cause_(std::move(cause)) {}
+  DbFailure(DbError error, Kind kind, std::string cause)
+      : DbError(std::move(error)), kind_(kind), cause_(std::move(cause)) {}
   Kind kind() const { return kind_; }
   const std::string& cause() const { return cause_; }
 
@@ -155,7 +169,7 @@ class Db {
   static void Observe(Observer observer);
 
   // The database failure `cause` on this file.
-  HostCtl::Lib::HostCtlException Error(const std::string& cause) const;
+  DbError Error(const std::string& cause) const;
   // Throws the last failure as a DbFailure, `more` added to its message.
   [[noreturn]] void Fail(const std::string& more = "") const;
   // SQLite's text for the last failure, with the reason the system gave

@@ -3,29 +3,30 @@
 // without touching the host.
 #include <nlohmann/json.hpp>
 #include "host_fixture.h"
+#include "tarnctl/api/session.h"
 
 namespace {
 
-using TarnCtl::Admin::Host;
+using namespace TarnCtl::Admin;
 
 class AdminTest : public HostTest {
  protected:
   // A host with something in every table the administration can fill.
   static void Seed(Host& host) {
-    host.AddPnic("pnic4");
-    host.AddPnic("pnic5");
-    host.AddClient("Management", "vm1");
-    host.AddClient("Management", "vm2");
-    host.AddSystemSwitch("sys0", 64);
-    host.AddDVSwitch({"dvs0", "ps0", std::nullopt, 256, 9000, {"pnic1", "pnic2"}});
-    host.AddDVPort({"dvs0", "100", {"vmA", "vmB"}, 42});
-    host.AddDVPort({"dvs0", "101", {}, 0});
-    host.AddOpaqueSwitch({"opq0", std::nullopt, 32, 5, {"pnic3"}});
-    host.AddUplinkTimeout("vswitch0", "pnic0", 7, 255);
-    host.AddLagTimeout("dvs0", 3, 0);
+    AddPnic(host.db(), "pnic4");
+    AddPnic(host.db(), "pnic5");
+    AddClient(host.db(), "Management", "vm1");
+    AddClient(host.db(), "Management", "vm2");
+    AddSystemSwitch(host.db(), "sys0", 64);
+    AddDVSwitch(host.db(), {"dvs0", "ps0", std::nullopt, 256, 9000, {"pnic1", "pnic2"}});
+    AddDVPort(host.db(), {"dvs0", "100", {"vmA", "vmB"}, 42});
+    AddDVPort(host.db(), {"dvs0", "101", {}, 0});
+    AddOpaqueSwitch(host.db(), {"opq0", std::nullopt, 32, 5, {"pnic3"}});
+    AddUplinkTimeout(host.db(), "vswitch0", "pnic0", 7, 255);
+    AddLagTimeout(host.db(), "dvs0", 3, 0);
     // Fault texts are free bytes, not necessarily text.
-    host.AddFault({"SetVlanId", "pg2", "boom\xff\"q\"\n", "boom in detail", 1, 2});
-    host.AddFault({"GetName", std::nullopt, std::nullopt, std::nullopt, 0, 1});
+    AddFault(host.db(), {"SetVlanId", "pg2", "boom\xff\"q\"\n", "boom in detail", 1, 2});
+    AddFault(host.db(), {"GetName", std::nullopt, std::nullopt, std::nullopt, 0, 1});
   }
 };
 
@@ -34,8 +35,8 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
   {
     Host host;
     Seed(host);
-    dumped = host.Dump();
-    shown = host.Show();
+    dumped = DumpHost(host.db());
+    shown = Show(host.db());
   }
   ASSERT_EQ(dumped.back(), '\n');
   for (const char* part : {"\"hex\":", "\"uplinkOrder\": [\n", "\"target\": null"}) {
@@ -45,11 +46,11 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
   for (const char* db : {"host.db", "other.db"}) {
     setenv("TARN_HOST_DB", Path(db).c_str(), 1);
     Host host;
-    host.Init(true);
-    host.Load(dumped);
-    EXPECT_EQ(host.Dump(), dumped) << db;
+    Init(host.db(), true);
+    LoadHost(host.db(), dumped);
+    EXPECT_EQ(DumpHost(host.db()), dumped) << db;
     // The same host but for its file, which the first line names.
-    const std::string again = host.Show();
+    const std::string again = Show(host.db());
     EXPECT_EQ(again.substr(again.find('\n')), shown.substr(shown.find('\n'))) << db;
   }
 }
@@ -59,7 +60,7 @@ TEST_F(AdminTest, DumpLoadDumpReproducesTheHost) {
 TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
   Host host;
   Seed(host);
-  const std::string good = host.Dump();
+  const std::string good = DumpHost(host.db());
   auto document = nlohmann::json::parse(good);  // keys sorted, as `jq -S` writes them
   auto& tables = document["tables"];
   tables.erase("fault");
@@ -67,13 +68,13 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
     for (auto& row : rows) row.erase("seq");
   }
   tables["meta"] = nlohmann::json::array();  // next_seq and ens_node: inferred
-  host.Load(document.dump());
-  const std::string shown = host.Show();
+  LoadHost(host.db(), document.dump());
+  const std::string shown = Show(host.db());
   EXPECT_EQ(shown.substr(0, shown.find("Faults")), [&] {
     Host copy;
-    copy.Load(good);
-    copy.ClearFaults();
-    const std::string all = copy.Show();
+    LoadHost(copy.db(), good);
+    ClearFaults(copy.db());
+    const std::string all = Show(copy.db());
     return all.substr(0, all.find("Faults"));
   }());
 
@@ -87,8 +88,8 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
   for (auto& [name, rows] : document["tables"].items()) {
     for (auto& row : rows) largest = std::max<int64_t>(largest, row.value("seq", 0));
   }
-  host.Load(document.dump());
-  const auto loaded = nlohmann::json::parse(host.Dump())["tables"];
+  LoadHost(host.db(), document.dump());
+  const auto loaded = nlohmann::json::parse(DumpHost(host.db()))["tables"];
   int64_t assigned = 0;
   for (const auto& row : loaded["portgroup"]) {
     if (row["name"] == groups[0]["name"] && row["layer"] == groups[0]["layer"])
@@ -106,26 +107,23 @@ TEST_F(AdminTest, LoadInfersWhatIsSafeToInfer) {
 // which tarnhost prints without the operation's name: the tarnhost
 // transcript), but those of the rules that the model and API tests show.
 TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
-  auto dvs = [](TarnCtl::Admin::DVSwitchSeed seed) {
-    return [seed](Host& h) { h.AddDVSwitch(seed); };
-  };
-  auto fault = [](TarnCtl::Admin::FaultSeed seed) { return [seed](Host& h) { h.AddFault(seed); }; };
-  auto dvport = [](TarnCtl::Admin::DVPortSeed seed) {
-    return [seed](Host& h) { h.AddDVPort(seed); };
-  };
+  auto dvs = [](DVSwitchSeed seed) { return [seed](Host& h) { AddDVSwitch(h.db(), seed); }; };
+  auto fault = [](FaultSeed seed) { return [seed](Host& h) { AddFault(h.db(), seed); }; };
+  auto dvport = [](DVPortSeed seed) { return [seed](Host& h) { AddDVPort(h.db(), seed); }; };
   const std::string tooLong = "0123456789012345678901234567890123";
   const struct {
     std::function<void(Host&)> call;
     std::string detail;
   } cases[] = {
-      {[&](Host& h) { h.AddPnic(tooLong); },
+      {[&](Host& h) { AddPnic(h.db(), tooLong); },
        "AddPnic: Pnic name " + tooLong + " is too long (at most 31 bytes)"},
-      {[](Host& h) { h.AddPnic("c,d"); },
+      {[](Host& h) { AddPnic(h.db(), "c,d"); },
        "AddPnic: Pnic name c,d contains a comma (such names are listed comma-separated)"},
-      {[](Host& h) { h.AddClient("nosuch", "vm1"); }, "AddClient: Portgroup nosuch does not exist"},
-      {[](Host& h) { h.AddClient("Management", "vm1"); },
+      {[](Host& h) { AddClient(h.db(), "nosuch", "vm1"); },
+       "AddClient: Portgroup nosuch does not exist"},
+      {[](Host& h) { AddClient(h.db(), "Management", "vm1"); },
        "AddClient: Client vm1 is already on portgroup Management"},
-      {[](Host& h) { h.AddClient("Management", "\x1b[2J"); },
+      {[](Host& h) { AddClient(h.db(), "Management", "\x1b[2J"); },
        "AddClient: Client name contains a control character (byte 1)"},
       {dvs({"d", {}, {}, 128, 1500, {"pnic0"}}),
        "AddDVSwitch: pnic0 is already linked to vswitch0"},
@@ -140,80 +138,115 @@ TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
       {dvport({"dvs0", "100", {}, 0}), "AddDVPort: DVPort 100 already exists on dvs0"},
       {dvport({"dvs0", "7", {"a", "a"}, 0}), "AddDVPort: Client a is given twice"},
       {[](Host& h) {
-         h.AddOpaqueSwitch({"o1", {}, 16, 17, {}});
+         AddOpaqueSwitch(h.db(), {"o1", {}, 16, 17, {}});
        },
        "AddOpaqueSwitch: Invalid number of used ports 17 (0-16)"},
-      {[](Host& h) { h.AddUplinkTimeout("vs0", "u1", 1, 256); },
+      {[](Host& h) { AddUplinkTimeout(h.db(), "vs0", "u1", 1, 256); },
        "AddUplinkTimeout: Invalid timeout 256 (0-255)"},
-      {[](Host& h) { h.AddUplinkTimeout("vswitch0", "pnic0", 7, 1); },
+      {[](Host& h) { AddUplinkTimeout(h.db(), "vswitch0", "pnic0", 7, 1); },
        "AddUplinkTimeout: An uplink timeout for vswitch0, pnic0, LAG 7 is already stored"},
-      {[](Host& h) { h.AddLagTimeout("", 3, 1); }, "AddLagTimeout: Portset name is empty"},
+      {[](Host& h) { AddLagTimeout(h.db(), "", 3, 1); }, "AddLagTimeout: Portset name is empty"},
       {fault({"", {}, {}, {}, 0, 1}), "AddFault: Fault operation is empty"},
       {fault({"GetName", {}, {}, {}, -1, 1}),
        "AddFault: Invalid skip count -1 (it must be 0 or more)"},
       {fault({"GetName", {}, {}, {}, 0, 0}), "AddFault: Invalid times 0 (it must be 1 or more)"},
       {fault({"SetVlanID", {}, {}, {}, 0, 1}),
        "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)"},
-      {[](Host& h) { h.RemovePnic("pnic0"); }, "RemovePnic: Pnic pnic0 is linked to vswitch0"},
-      {[](Host& h) { h.RemovePnic("pnic9"); }, "RemovePnic: Pnic pnic9 does not exist"},
-      {[](Host& h) { h.RemoveDVSwitch("ps0"); }, "RemoveDVSwitch: DVS ps0 does not exist"},
-      {[](Host& h) { h.RemoveDVPort("d9", "1"); }, "RemoveDVPort: DVPort 1 does not exist on d9"},
-      {[](Host& h) { h.RemoveOpaqueSwitch("dvs0"); },
+      {[](Host& h) { RemovePnic(h.db(), "pnic0"); },
+       "RemovePnic: Pnic pnic0 is linked to vswitch0"},
+      {[](Host& h) { RemovePnic(h.db(), "pnic9"); }, "RemovePnic: Pnic pnic9 does not exist"},
+      {[](Host& h) { RemoveDVSwitch(h.db(), "ps0"); }, "RemoveDVSwitch: DVS ps0 does not exist"},
+      {[](Host& h) { RemoveDVPort(h.db(), "d9", "1"); },
+       "RemoveDVPort: DVPort 1 does not exist on d9"},
+      {[](Host& h) { RemoveOpaqueSwitch(h.db(), "dvs0"); },
        "RemoveOpaqueSwitch: Opaque switch dvs0 does not exist"},
-      {[](Host& h) { h.RemoveClient("pg1", "vm1"); },
+      {[](Host& h) { RemoveClient(h.db(), "pg1", "vm1"); },
        "RemoveClient: Client vm1 is not on portgroup pg1"},
-      {[](Host& h) { h.RemoveUplinkTimeout("vswitch0", "pnic0", 8); },
+      {[](Host& h) { RemoveUplinkTimeout(h.db(), "vswitch0", "pnic0", 8); },
        "RemoveUplinkTimeout: No uplink timeout for vswitch0, pnic0, LAG 8 is stored"},
-      {[](Host& h) { h.RemoveLagTimeout("vs0", 1); },
+      {[](Host& h) { RemoveLagTimeout(h.db(), "vs0", 1); },
        "RemoveLagTimeout: No LAG timeout for vs0, LAG 1 is stored"},
   };
   Host host;
   Seed(host);
-  const std::string before = host.Dump();
+  const std::string before = DumpHost(host.db());
   for (const auto& c : cases) {
     EXPECT_EQ(Refused([&] { c.call(host); }).second, c.detail);
-    EXPECT_EQ(host.Dump(), before) << c.detail;
+    EXPECT_EQ(DumpHost(host.db()), before) << c.detail;
   }
 }
 
 // What seeding adds, removal takes away whole: a distributed switch from
 // the cache too, with its DVPorts; a fault keeps its number while armed.
 TEST_F(AdminTest, RemovalUndoesSeeding) {
-  using TarnCtl::Admin::Listing;
   Host host;
-  const std::string before = host.Show();
-  host.AddPnic("pnic4");
-  host.AddClient("Management", "vm1");
-  host.AddSystemSwitch("sys0", 64);
-  host.AddDVSwitch({"dvs0", "ps0", std::nullopt, 128, 1500, {"pnic1"}});
-  host.AddDVPort({"dvs0", "100", {}, 0});
-  host.AddOpaqueSwitch({"opq0", std::nullopt, 32, 5, {"pnic4"}});
-  host.AddUplinkTimeout("vswitch0", "pnic0", 7, 255);
-  host.AddLagTimeout("ps0", 3, 0);
-  host.AddFault({"SetVlanId", "pg2", {}, {}, 0, 1});
-  host.AddFault({"GetName", {}, "a\tb", {}, 0, 1});
-  host.RemoveFault(1);
-  EXPECT_EQ(host.List(Listing::kFaults),
-            (std::vector<TarnCtl::Admin::ListRow>{
+  const std::string before = Show(host.db());
+  AddPnic(host.db(), "pnic4");
+  AddClient(host.db(), "Management", "vm1");
+  AddSystemSwitch(host.db(), "sys0", 64);
+  AddDVSwitch(host.db(), {"dvs0", "ps0", std::nullopt, 128, 1500, {"pnic1"}});
+  AddDVPort(host.db(), {"dvs0", "100", {}, 0});
+  AddOpaqueSwitch(host.db(), {"opq0", std::nullopt, 32, 5, {"pnic4"}});
+  AddUplinkTimeout(host.db(), "vswitch0", "pnic0", 7, 255);
+  AddLagTimeout(host.db(), "ps0", 3, 0);
+  AddFault(host.db(), {"SetVlanId", "pg2", {}, {}, 0, 1});
+  AddFault(host.db(), {"GetName", {}, "a\tb", {}, 0, 1});
+  RemoveFault(host.db(), 1);
+  EXPECT_EQ(List(host.db(), Listing::kFaults),
+            (std::vector<ListRow>{
                 {"2", "GetName", "", "0", "1", "\"a\\tb\"", "\"injected fault in GetName\""}}));
-  host.RemoveFault(2);
-  host.RemoveOpaqueSwitch("opq0");
-  host.RemovePnic("pnic4");
-  host.RemoveDVSwitch("dvs0");
-  host.RemoveSystemSwitch("sys0");
-  host.RemoveClient("Management", "vm1");
-  host.RemoveUplinkTimeout("vswitch0", "pnic0", 7);
-  host.RemoveLagTimeout("ps0", 3);
-  EXPECT_EQ(host.Show(), before);
-  EXPECT_TRUE(host.List(Listing::kDVPorts).empty());
+  RemoveFault(host.db(), 2);
+  RemoveOpaqueSwitch(host.db(), "opq0");
+  RemovePnic(host.db(), "pnic4");
+  RemoveDVSwitch(host.db(), "dvs0");
+  RemoveSystemSwitch(host.db(), "sys0");
+  RemoveClient(host.db(), "Management", "vm1");
+  RemoveUplinkTimeout(host.db(), "vswitch0", "pnic0", 7);
+  RemoveLagTimeout(host.db(), "ps0", 3);
+  EXPECT_EQ(Show(host.db()), before);
+  EXPECT_TRUE(List(host.db(), Listing::kDVPorts).empty());
+}
+
+// Hosts open at once in one process stay apart: the process's own, a
+// private one in memory and another host file, each with what was done to
+// it; the other file keeps what it committed. The process's host is never
+// handed out for another location.
+TEST_F(AdminTest, HostsOpenAtOnceStayApart) {
+  const std::string otherPath = Path("other.db");
+  auto pnics = [](Host& host) {
+    std::string names;
+    for (const auto& row : List(host.db(), Listing::kPnics)) names += row[0] + " ";
+    return names;
+  };
+  Host mine;
+  AddPnic(mine.db(), "pnic4");
+  Host memory = Host::Open(TarnCtl::Store::Location::Memory("snapshot"));
+  LoadHost(memory.db(), DumpHost(mine.db()));
+  AddPnic(memory.db(), "pnic5");
+  {
+    Host other = Host::Open(TarnCtl::Store::Location::File(otherPath));
+    RemovePnic(other.db(), "pnic3");
+    EXPECT_EQ(Show(other.db()).substr(0, otherPath.size() + 7), "Host: " + otherPath + "\n");
+  }
+  Host other = Host::Open(TarnCtl::Store::Location::File(otherPath));
+  EXPECT_EQ(pnics(mine), "pnic0 pnic1 pnic2 pnic3 pnic4 ");
+  EXPECT_EQ(pnics(memory), "pnic0 pnic1 pnic2 pnic3 pnic4 pnic5 ");
+  EXPECT_EQ(pnics(other), "pnic0 pnic1 pnic2 ");
+  EXPECT_EQ(memory.Path(), "snapshot");
+  EXPECT_EQ(Refusal([&] {
+              TarnCtl::Api::Session::AcquireAt(TarnCtl::Store::Location::File(otherPath), {});
+            }),
+            "Host " + path_ + " is open already");
+  EXPECT_EQ(TarnCtl::Api::Session::AcquireAt(TarnCtl::Store::Location::File(path_), {})->path(),
+            mine.Path());
 }
 
 TEST_F(AdminTest, SeededSwitchesFollowTheirDefaults) {
   Host host;
-  host.AddDVSwitch({"dvs0", {}, {}, 128, 1500, {}});
-  host.AddDVSwitch({"x", "dvs-dvs0", {}, 128, 1500, {}});
-  host.AddSystemSwitch("sys0", 64);
-  const std::string dump = host.Dump();
+  AddDVSwitch(host.db(), {"dvs0", {}, {}, 128, 1500, {}});
+  AddDVSwitch(host.db(), {"x", "dvs-dvs0", {}, 128, 1500, {}});
+  AddSystemSwitch(host.db(), "sys0", 64);
+  const std::string dump = DumpHost(host.db());
   // An id derived from the name (never the portset) stays unique.
   EXPECT_NE(dump.find("\"switch_id\": \"dvs-dvs0\""), std::string::npos);
   EXPECT_NE(dump.find("\"switch_id\": \"dvs-x\""), std::string::npos);
@@ -233,7 +266,7 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   using Json = nlohmann::ordered_json;
   Host host;
   Seed(host);
-  const std::string good = host.Dump();
+  const std::string good = DumpHost(host.db());
   const Json document = Json::parse(good);
   // The pointer to the first row of `table` with that name (meta's: key).
   auto at = [&](const std::string& table, const std::string& name) {
@@ -300,9 +333,9 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
       {"counter behind", with(nextSeq, "3"), "is not beyond the largest seq"},
   };
   for (const auto& c : cases) {
-    const std::string message = Refusal([&] { host.Load(c.text); });
+    const std::string message = Refusal([&] { LoadHost(host.db(), c.text); });
     EXPECT_NE(message.find(c.message), std::string::npos) << c.what << ": " << message;
-    EXPECT_EQ(host.Dump(), good) << c.what;
+    EXPECT_EQ(DumpHost(host.db()), good) << c.what;
   }
 }
 

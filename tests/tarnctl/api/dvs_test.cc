@@ -71,9 +71,9 @@ TEST_F(DvsTest, LoadedTimeoutsFilterByLagAndGoWithAReboot) {
   SeedSampleHost();
   {
     TarnCtl::Admin::Host admin;
-    admin.AddUplinkTimeout("vs1", "pnic2", 1, 1);
-    admin.AddUplinkTimeout("vs1", "pnic1", 16, 65);
-    admin.AddLagTimeout("vs1", 7, 1);
+    TarnCtl::Admin::AddUplinkTimeout(admin.db(), "vs1", "pnic2", 1, 1);
+    TarnCtl::Admin::AddUplinkTimeout(admin.db(), "vs1", "pnic1", 16, 65);
+    TarnCtl::Admin::AddLagTimeout(admin.db(), "vs1", 7, 1);
   }
   NetworkInfoImpl network;
   auto info = network.GetVirtualSwitchInfo();

@@ -11,7 +11,7 @@ using TarnCtl::Admin::FaultSeed;
 using FaultTest = HostTest;
 
 void Arm(FaultSeed seed) {
-  TarnCtl::Admin::Host().AddFault(seed);
+  TarnCtl::Admin::AddFault(TarnCtl::Admin::Host().db(), seed);
 }
 
 FaultSeed Fault(const char* operation, std::optional<std::string> on = std::nullopt,
@@ -81,8 +81,8 @@ TEST_F(FaultTest, ATargetMatchesTheObjectOrTheNameArgument) {
   };
   TarnCtl::Admin::Host admin;
   for (const Case& c : cases) {
-    admin.ClearFaults();
-    admin.AddFault(c.fault);
+    TarnCtl::Admin::ClearFaults(admin.db());
+    TarnCtl::Admin::AddFault(admin.db(), c.fault);
     EXPECT_EQ(Outcome(c.call), c.outcome) << c.fault.operation << " on " << c.fault.on.value_or("");
   }
 }

@@ -137,14 +137,14 @@ TEST_F(RefusalTest, EveryRefusalSaysWhatAndChangesNothing) {
        },
        "Opaque switch op0 cannot be changed"},
   };
-  const std::string before = admin.Dump();
+  const std::string before = TarnCtl::Admin::DumpHost(admin.db());
   for (const Case& c : cases) {
     const auto [message, detail] = Refused([&] { c.call(*info); });
     EXPECT_EQ(message.substr(0, c.message.size()), c.message) << c.operation;
     EXPECT_EQ(detail.rfind(std::string(c.operation) + ": " + c.message, 0), 0u) << detail;
     EXPECT_EQ(message.find(path_), std::string::npos);
   }
-  EXPECT_EQ(admin.Dump(), before);
+  EXPECT_EQ(TarnCtl::Admin::DumpHost(admin.db()), before);
 }
 
 // A refusal follows the state: what was taken becomes free and back.

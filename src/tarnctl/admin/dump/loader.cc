@@ -25,8 +25,9 @@
 
 #include "tarnctl/admin/dump/catalogue.h"
 #include "tarnctl/admin/host.h"
-#include "tarnctl/admin/state.h"
+#include "tarnctl/admin/whole_host.h"
 #include "tarnctl/instrument/call.h"
+#include "tarnctl/instrument/errors.h"
 #include "tarnctl/model/invariants.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/model/teaming.h"
@@ -45,8 +46,7 @@ using HostCtl::Lib::HostCtlException;
 using Store::Rows::Value;
 
 [[noreturn]] void Bad(const std::string& why) {
-  const std::string message = "Cannot load dump: " + why;
-  throw HostCtlException(message, "Load: " + message);
+  throw Instrument::Refused("Cannot load dump: " + why);
 }
 
 std::string Quote(const std::string& text) {
@@ -107,7 +107,7 @@ class Loader {
   Loader(Store::Db& db, const Progress& progress) : db_(db), progress_(progress) {}
 
   void Read(const std::string& text) {
-    static_assert(Host::kLoadRoom >= simdjson::SIMDJSON_PADDING);
+    static_assert(kLoadRoom >= simdjson::SIMDJSON_PADDING);
     // The parser reads up to simdjson::SIMDJSON_PADDING bytes past the text.
     std::optional<simdjson::padded_string> copy;
     if (text.capacity() - text.size() < simdjson::SIMDJSON_PADDING) copy.emplace(text);
@@ -492,8 +492,7 @@ class Loader {
 
 }  // namespace
 
-void Host::Load(const std::string& text, const Progress& progress) {
-  Store::Db& db = state_->db();
+void LoadHost(Store::Db& db, const std::string& text, const Progress& progress) {
   Instrument::Scope scope(db, "Load");
   db.PrepareBulkChange();
   Store::Transaction transaction(db);

@@ -15,9 +15,8 @@
 #include <unordered_map>
 
 #include "tarnctl/admin/dump/catalogue.h"
-#include "tarnctl/admin/host.h"
-#include "tarnctl/admin/state.h"
 #include "tarnctl/admin/text_json.h"
+#include "tarnctl/admin/whole_host.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/store/policy_codec.h"
 
@@ -73,8 +72,7 @@ void Append(std::string& out, const Json& json, int depth) {
 
 }  // namespace
 
-std::string Host::Dump(const Progress& progress) {
-  Store::Db& db = state_->db();
+std::string DumpHost(Store::Db& db, const Progress& progress) {
   Instrument::Scope scope(db, "Dump");
   int64_t total = 0;
   for (const auto& table : Dump::Tables()) total += Store::Rows::Count(db, table.Shape());

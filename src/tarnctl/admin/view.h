@@ -1,0 +1,23 @@
+// What the homes of the host's objects share to print them: a row of a
+// list for scripts, text for people, JSON for programs.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "tarnctl/admin/text_json.h"
+
+namespace TarnCtl::Admin {
+
+using Store::Json;
+
+// A row of text fields per object (`tarnhost NOUN list`); an empty field is
+// none, and lists of pnics are joined by commas.
+using ListRow = std::vector<std::string>;
+
+// Names as a field of a list row holds them: joined by commas.
+std::string Commas(const std::vector<std::string>& names);
+// Items as people read them: joined by ", ", "(none)" for none.
+std::string Listed(const std::vector<std::string>& items);
+
+}  // namespace TarnCtl::Admin
