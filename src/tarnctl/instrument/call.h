@@ -95,11 +95,14 @@ class Scope {
 };
 
 // True when `function` (a function's name as the compiler writes it) is the
-// function `operation`, a constructor of that class included.
+// function `operation`, a constructor of that class included. Compilers
+// differ in what they write before the name: a qualifier ("X::"), or the
+// return type, with or without a space ("char *f(...)", "char* f(...)").
 constexpr bool IsFunction(std::string_view function, std::string_view operation) {
   for (size_t at = function.find(operation); at != std::string_view::npos;
        at = function.find(operation, at + 1)) {
-    const bool start = at == 0 || function[at - 1] == ':' || function[at - 1] == ' ';
+    const bool start =
+        at == 0 || std::string_view(": *&").find(function[at - 1]) != std::string_view::npos;
     const size_t end = at + operation.size();
     if (start && end < function.size() && function[end] == '(') return true;
   }

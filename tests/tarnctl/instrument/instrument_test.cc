@@ -48,7 +48,14 @@ TEST(OperationsTest, AnOperationIsTheFunctionItIsWrittenIn) {
   static_assert(
       IsFunction("TarnCtl::Network::PortGroupImpl::PortGroupImpl(const string&)", "PortGroupImpl"));
   static_assert(IsFunction("int NODI_CheckSig(NODI_SigResult*, int, uint32_t*)", "NODI_CheckSig"));
+  // What clang writes: no space between a pointer or reference and the name.
+  static_assert(
+      IsFunction("const char *TARN_ReturnStatusToString(int)", "TARN_ReturnStatusToString"));
+  static_assert(IsFunction("const Param &X::GetParam() const", "GetParam"));
+  static_assert(IsFunction("const Param& X::GetParam() const", "GetParam"));
   static_assert(!IsFunction("void X::GetVlanIdentity()", "GetVlanId"));
+  static_assert(!IsFunction("void X::SetVlanId", "SetVlanId"));
+  static_assert(!IsFunction("int *X_SetVlanId(int)", "SetVlanId"));
   static_assert(!IsFunction("void X::ResetVlanId(int)", "SetVlanId"));
 }
 
