@@ -32,7 +32,7 @@ Target Of(const char* record) {
 Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault)
     : db_(db), previous_(g_running) {
   const Operation& operation = Describe(op);
-  g_running = operation.name.c_str();
+  g_running = operation.name;
   if (db_ != nullptr) {
     previousContext_ = db_->context();
     db_->set_context(g_running);
@@ -40,7 +40,7 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   if (TraceOn()) {
     std::string line;
     if (!target.record.empty()) line.append(target.record).append("::");
-    line += operation.name + '(' + args + ')';
+    line.append(operation.name).append(1, '(').append(args).append(1, ')');
     if (!target.on.empty()) {
       line += " on ";
       AppendEscaped(line, std::string(target.on));

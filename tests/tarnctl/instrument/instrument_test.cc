@@ -3,7 +3,6 @@
 #include <sys/stat.h>
 
 #include <fstream>
-#include <sstream>
 
 #include "scratch.h"
 #include "tarnctl/instrument/call.h"
@@ -14,16 +13,14 @@ namespace {
 
 using namespace TarnCtl::Instrument;
 
-TEST(OperationsTest, OneEntryPerNameInNameOrder) {
-  const auto& operations = Operations();
+TEST(OperationsTest, LookupsFindEveryOperation) {
+  const auto operations = Operations();
   for (size_t i = 0; i < operations.size(); ++i) {
-    EXPECT_EQ(static_cast<size_t>(operations[i].op), i) << operations[i].name;
-    if (i > 0) {
-      EXPECT_LT(std::string(operations[i - 1].name), operations[i].name);
-    }
     EXPECT_EQ(FindOperation(operations[i].name), &operations[i]);
+    EXPECT_EQ(&Describe(static_cast<Op>(i)), &operations[i]);
   }
   EXPECT_EQ(FindOperation("SetVlanID"), nullptr);
+  EXPECT_EQ(FindOperation("ZZZ"), nullptr);
   const struct {
     const char* given;
     const char* nearest;
@@ -33,13 +30,20 @@ TEST(OperationsTest, OneEntryPerNameInNameOrder) {
   for (const auto& c : cases) {
     EXPECT_EQ(NearestOperation(c.given).value_or(""), c.nearest) << c.given;
   }
-  // The target lists and the unfaultable calls name registered operations.
-  for (const TargetList& list : kTargetLists) {
-    std::istringstream names{std::string(list.operations)};
-    for (std::string name; names >> name;) EXPECT_NE(FindOperation(name), nullptr) << name;
-  }
   EXPECT_EQ(FindOperation("SetTeamingPolicy")->targets, kStandardSwitch | kPortGroup);
+  EXPECT_FALSE(FindOperation("TARN_ReturnStatusToString")->faultable);
+  EXPECT_TRUE(FindOperation("NODI_Set")->faultable);
   EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
+  EXPECT_EQ(TargetText(kNoTarget), "nothing (any call)");
+}
+
+// The table's checks refuse what would break the lookups.
+TEST(OperationsTest, AMalformedEntryIsRefused) {
+  static_assert(WellFormed({"NODI_Set", kNoTarget}));
+  static_assert(!WellFormed({"", kNoTarget}));
+  static_assert(!WellFormed({"Get MTU", kAnySwitch}));
+  static_assert(!WellFormed({"1Refresh", kNoTarget}));
+  static_assert(!WellFormed({"Destroy", kRecord, Access::kNone}));
 }
 
 TEST(OperationsTest, AnOperationIsTheFunctionItIsWrittenIn) {
