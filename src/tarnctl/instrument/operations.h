@@ -1,9 +1,9 @@
 // The registry of the library's operations, one table: each one's name (as
 // the trace writes it and as faults name it), what a fault's target (`--on`)
-// may name for it, and whether it runs on the host at all. Every library
-// entry point declares its operation with TARN_CALL (call.h), which refuses
-// to compile when the operation is not registered or is not the function it
-// is written in.
+// may name for it, and whether it reads or changes the host or runs without
+// it. Every library entry point declares its operation with TARN_CALL
+// (call.h), which refuses to compile when the operation is not registered or
+// is not the function it is written in.
 #pragma once
 
 #include <iterator>
@@ -29,12 +29,14 @@ enum TargetKind : unsigned {
 
 // How an operation uses the host.
 enum class Access : unsigned char {
-  kNone,  // runs without a host (no fault can hit it)
-  kHost,
+  kNone,     // runs without a host (no fault can hit it)
+  kReads,    // reads the host, or leaves it alone
+  kChanges,  // may change the host: runs in a savepoint of its own (call.h)
 };
+using enum Access;
 
 struct Operation {
-  constexpr Operation(const char* name, unsigned targets, Access access = Access::kHost)
+  constexpr Operation(const char* name, unsigned targets, Access access = kReads)
       : name(name), targets(targets), access(access), faultable(access != Access::kNone) {}
 
   const char* name;  // as the trace writes it and faults name it
@@ -45,14 +47,14 @@ struct Operation {
 
 // Every operation, in name order.
 inline constexpr Operation kOperations[] = {
-    {"ActivateEns", kAnySwitch},
-    {"AddDVPortUplink", kDistributedSwitch | kOpaqueSwitch},
-    {"AddDVSwitch", kNameArgument},
-    {"AddPortGroup", kStandardSwitch},
-    {"AddUplink", kStandardSwitch},
-    {"AddVirtualSwitch", kNameArgument},
+    {"ActivateEns", kAnySwitch, kChanges},
+    {"AddDVPortUplink", kDistributedSwitch | kOpaqueSwitch, kChanges},
+    {"AddDVSwitch", kNameArgument, kChanges},
+    {"AddPortGroup", kStandardSwitch, kChanges},
+    {"AddUplink", kStandardSwitch, kChanges},
+    {"AddVirtualSwitch", kNameArgument, kChanges},
     {"DVPortImpl", kNameArgument},
-    {"DeactivateEns", kAnySwitch},
+    {"DeactivateEns", kAnySwitch, kChanges},
     {"GetAllPortGroupNames", kNoTarget},
     {"GetCdpStatus", kStandardSwitch},
     {"GetConfiguredPorts", kAnySwitch},
@@ -88,33 +90,33 @@ inline constexpr Operation kOperations[] = {
     {"IsValid", kDVPort},
     {"IsValidPortGroup", kNameArgument},
     {"IsValidVirtualSwitch", kNameArgument},
-    {"LoadLagTimeoutConfig", kNameArgument},
-    {"LoadUplinkTimeoutConfig", kNameArgument},
+    {"LoadLagTimeoutConfig", kNameArgument, kChanges},
+    {"LoadUplinkTimeoutConfig", kNameArgument, kChanges},
     {"NODI_CheckSig", kNoTarget},
-    {"NODI_ParamListDestroy", kNoTarget, Access::kNone},
-    {"NODI_Set", kNoTarget},
+    {"NODI_ParamListDestroy", kNoTarget, kNone},
+    {"NODI_Set", kNoTarget, kChanges},
     {"NetworkInfoImpl", kNoTarget},
     {"ParseCdpStatus", kNameArgument},
     {"PortGroupImpl", kNameArgument},
-    {"ReassociateEnsUplinks", kAnySwitch},
+    {"ReassociateEnsUplinks", kAnySwitch, kChanges},
     {"Refresh", kNoTarget},
-    {"RemoveDVPortUplink", kDistributedSwitch | kOpaqueSwitch},
-    {"RemovePortGroup", kStandardSwitch},
-    {"RemoveUplink", kStandardSwitch},
-    {"RemoveVirtualSwitch", kNameArgument},
-    {"RestoreDVSwitches", kNameArgument},
-    {"RestoreUplinks", kStandardSwitch},
-    {"RestoreVirtualSwitches", kNoTarget},
-    {"SetCdpStatus", kStandardSwitch},
-    {"SetConnectionId", kDVPort},
-    {"SetMTU", kAnySwitch},
+    {"RemoveDVPortUplink", kDistributedSwitch | kOpaqueSwitch, kChanges},
+    {"RemovePortGroup", kStandardSwitch, kChanges},
+    {"RemoveUplink", kStandardSwitch, kChanges},
+    {"RemoveVirtualSwitch", kNameArgument, kChanges},
+    {"RestoreDVSwitches", kNameArgument, kChanges},
+    {"RestoreUplinks", kStandardSwitch, kChanges},
+    {"RestoreVirtualSwitches", kNoTarget, kChanges},
+    {"SetCdpStatus", kStandardSwitch, kChanges},
+    {"SetConnectionId", kDVPort, kChanges},
+    {"SetMTU", kAnySwitch, kChanges},
     {"SetMaxActiveUplinks", kNoTarget},
-    {"SetTeamingPolicy", kStandardSwitch | kPortGroup},
+    {"SetTeamingPolicy", kStandardSwitch | kPortGroup, kChanges},
     {"SetUplinkOrder", kNoTarget},
-    {"SetVlanId", kPortGroup},
+    {"SetVlanId", kPortGroup, kChanges},
     {"SwitchExists", kNameArgument},
-    {"TARN_ReturnStatusToString", kNoTarget, Access::kNone},
-    {"TestDVPortNota", kDVPort},
+    {"TARN_ReturnStatusToString", kNoTarget, kNone},
+    {"TestDVPortNota", kDVPort, kChanges},
     {"VirtualSwitchInfoImpl", kNoTarget},
 };
 
@@ -137,7 +139,7 @@ constexpr bool WellFormed(const Operation& operation) {
     if (!word) return false;
   }
   // A call without a host has nothing to be matched on.
-  return operation.access != Access::kNone || operation.targets == kNoTarget;
+  return operation.access != kNone || operation.targets == kNoTarget;
 }
 static_assert(
     [] {

@@ -8,6 +8,9 @@
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/operations.h"
 #include "tarnctl/instrument/trace.h"
+#include "tarnctl/store/faults.h"
+#include "tarnctl/store/host_file.h"
+#include "tarnctl/store/meta.h"
 
 namespace {
 
@@ -61,6 +64,42 @@ TEST(OperationsTest, AnOperationIsTheFunctionItIsWrittenIn) {
   static_assert(!IsFunction("void X::SetVlanId", "SetVlanId"));
   static_assert(!IsFunction("int *X_SetVlanId(int)", "SetVlanId"));
   static_assert(!IsFunction("void X::ResetVlanId(int)", "SetVlanId"));
+}
+
+using SavepointTest = ScratchTest;
+
+// What an operation that changes the host did is kept when it returns and
+// undone when it throws; a fault that fails it is used up all the same.
+TEST_F(SavepointTest, AChangingOperationIsKeptOrUndoneWhole) {
+  auto host =
+      TarnCtl::Store::HostFile::Open(TarnCtl::Store::Location::File(Path("host.db")), {0, true});
+  TarnCtl::Store::Db& db = host->db();
+  TarnCtl::Store::Transaction run(db);
+  auto call = [&](Op op) { return Call(&db, op, Nothing(), [] { return std::string(); }); };
+  const struct {
+    Op op;
+    bool throws;
+    int64_t kept;  // changes kept of the one made
+  } cases[] = {
+      {TARN_OPERATION(SetVlanId), false, 1},
+      {TARN_OPERATION(SetVlanId), true, 0},
+      {TARN_OPERATION(NODI_Set), true, 0},
+  };
+  for (const auto& c : cases) {
+    const int64_t before = TarnCtl::Store::Meta::NextSeq(db);
+    try {
+      const Call running = call(c.op);
+      TarnCtl::Store::Meta::NextSeq(db);
+      if (c.throws) throw std::runtime_error("failed");
+    } catch (const std::runtime_error&) {
+    }
+    EXPECT_EQ(TarnCtl::Store::Meta::NextSeq(db) - before, 1 + c.kept)
+        << Describe(c.op).name << (c.throws ? " throwing" : "");
+  }
+  TarnCtl::Store::Faults::Insert(db, {0, "SetMTU", std::nullopt, "injected", "", 0, 1});
+  EXPECT_EQ(Refusal([&] { call(TARN_OPERATION(SetMTU)); }), "injected");
+  EXPECT_EQ(Refusal([&] { call(TARN_OPERATION(SetMTU)); }), "");
+  run.Commit();
 }
 
 using TraceTest = ScratchTest;
