@@ -28,6 +28,8 @@ Store::Standard::Row CreateStandardSwitch(Store::Db& db, const std::string& name
   const Store::Standard::Row row{static_cast<uint32_t>(ports), Model::kDefaultMtu,
                                  Model::kDefaultCdpStatus, system,
                                  Store::EncodeTeamingPolicy(teaming)};
+  // Administration makes this change outside any operation's savepoint:
+  // it is made whole here.
   Store::Transaction transaction(db);
   Store::Standard::DeleteStored(db, name);
   const int64_t seq = Store::Meta::NextSeq(db);
@@ -56,6 +58,8 @@ void CreateDVSwitch(Store::Db& db, const NewDVSwitch& dvs) {
                                     static_cast<int32_t>(dvs.version),
                                     static_cast<uint32_t>(dvs.ports),
                                     static_cast<uint32_t>(dvs.mtu)};
+  // Administration makes this change outside any operation's savepoint:
+  // it is made whole here.
   Store::Transaction transaction(db);
   Store::Distributed::DeleteCachedClashes(db, dvs.name, dvs.portset, dvs.switchId);
   const int64_t seq = Store::Meta::NextSeq(db);

@@ -5,7 +5,6 @@
 #include "tarnctl/model/names.h"
 #include "tarnctl/store/dvports.h"
 #include "tarnctl/store/meta.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Api {
 
@@ -26,12 +25,12 @@ const Store::Distributed::Row& DistributedState::Row() {
 }
 
 uint32_t DistributedState::UsedPorts() {
-  Row();
+  EnsureStillExists();
   return static_cast<uint32_t>(Store::Distributed::UsedPorts(db(), name_));
 }
 
 std::vector<std::string> DistributedState::Uplinks() {
-  Row();
+  EnsureStillExists();
   std::vector<std::string> pnics;
   for (auto& uplink : Store::Distributed::Uplinks(db(), Layer::kRunning, name_)) {
     pnics.push_back(std::move(uplink.pnic));
@@ -40,7 +39,7 @@ std::vector<std::string> DistributedState::Uplinks() {
 }
 
 std::string DistributedState::EnsName(bool) {
-  Row();
+  EnsureStillExists();
   return portset_;
 }
 
@@ -60,22 +59,18 @@ void DistributedState::AddDVPortUplink(const std::string& uplink, const DVPortPa
         "(the port's connection id is " + std::to_string(*connectionId) + ")");
   }
   Model::CheckFreePnic(db(), uplink);
-  Store::Transaction transaction(db());
   const int64_t seq = Store::Meta::NextSeq(db());
   for (Layer layer : Store::kBothLayers) {
     Store::Distributed::AddUplink(db(), layer, name_, {uplink, port.portId}, seq);
   }
-  transaction.Commit();
 }
 
 void DistributedState::RemoveDVPortUplink(const std::string& uplink) {
-  Row();
+  EnsureStillExists();
   if (!Store::Distributed::HasUplink(db(), Layer::kRunning, name_, uplink)) {
     throw Refused(uplink + " is not an uplink of DVS " + name_);
   }
-  Store::Transaction transaction(db());
   Store::Distributed::RemoveUplink(db(), name_, uplink);
-  transaction.Commit();
 }
 
 std::vector<DVPortParam> DistributedState::DVPorts() {
@@ -88,11 +83,9 @@ std::vector<DVPortParam> DistributedState::DVPorts() {
 }
 
 void DistributedState::SetMtu(uint16_t mtu) {
-  Row();
+  EnsureStillExists();
   Model::Check(Model::kMtu, mtu);
-  Store::Transaction transaction(db());
   Store::Distributed::SetMtu(db(), name_, mtu);
-  transaction.Commit();
 }
 
 }  // namespace TarnCtl::Api

@@ -14,6 +14,8 @@ class DistributedState : public DVSwitchState {
 
   // The running row; refuses when the switch no longer exists.
   const Store::Distributed::Row& Row();
+  // Refuses when the switch no longer exists.
+  void EnsureStillExists() { Row(); }
   const std::string& name() const { return name_; }
 
   Instrument::Target CallTarget() const override { return Instrument::On(name_, portset_); }

@@ -7,12 +7,10 @@
 #include "tarnctl/store/distributed.h"
 #include "tarnctl/store/dvports.h"
 #include "tarnctl/store/meta.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
 using HostCtl::Network::DVPortParam;
-using Store::Transaction;
 
 namespace {
 
@@ -59,9 +57,7 @@ uint32_t DVPortImpl::GetConnectionId() const {
 void DVPortImpl::SetConnectionId(uint32_t connectionId) {
   TARN_CALL_ON(*state_, SetConnectionId, connectionId);
   CheckValid(*state_);
-  Transaction transaction(state_->db());
   Store::DVPorts::SetConnectionId(state_->db(), state_->dvs, state_->param.portId, connectionId);
-  transaction.Commit();
   state_->param.connectionId = connectionId;
 }
 
@@ -69,9 +65,7 @@ int DVPortImpl::TestDVPortNota() {
   TARN_CALL_ON(*state_, TestDVPortNota);
   CheckValid(*state_);
   Store::Db& db = state_->db();
-  Transaction transaction(db);
   Store::DVPorts::AddEvent(db, state_->dvs, state_->param.portId, "nota", Store::Meta::NextSeq(db));
-  transaction.Commit();
   return 0;
 }
 

@@ -7,12 +7,10 @@
 #include "tarnctl/api/portset_state.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/meta.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
 using Instrument::Refused;
-using Store::Transaction;
 
 bool PortsetImpl::GetEnsMode() {
   TARN_CALL_ON(*state_, GetEnsMode);
@@ -26,9 +24,7 @@ void PortsetImpl::ActivateEns(bool intr, bool fastSwitch) {
   if (!Store::Meta::EnsNodeSet(db)) {
     throw Refused("ENS is not enabled on this host", "(its activation node is not set)");
   }
-  Transaction transaction(db);
   Store::Ens::Activate(db, {portset, intr, fastSwitch});
-  transaction.Commit();
 }
 
 void PortsetImpl::DeactivateEns() {
@@ -36,18 +32,14 @@ void PortsetImpl::DeactivateEns() {
   const std::string portset = state_->EnsName(true);
   Store::Db& db = state_->db();
   if (!Store::Ens::IsActive(db, portset)) throw Refused("ENS is not active on " + portset);
-  Transaction transaction(db);
   Store::Ens::Deactivate(db, portset);
-  transaction.Commit();
 }
 
 void PortsetImpl::ReassociateEnsUplinks(bool mode, bool force, int reserved1, int reserved2) {
   TARN_CALL_ON(*state_, ReassociateEnsUplinks, mode, force, reserved1, reserved2);
   const std::string portset = state_->EnsName(true);
   Store::Db& db = state_->db();
-  Transaction transaction(db);
   Store::Ens::AddReassociation(db, portset, mode, force, Store::Meta::NextSeq(db));
-  transaction.Commit();
 }
 
 }  // namespace TarnCtl::Network

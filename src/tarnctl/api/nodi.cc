@@ -11,7 +11,6 @@
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/nodi_list.h"
 #include "tarnctl/store/meta.h"
-#include "tarnctl/store/transaction.h"
 
 using HostCtl::Lib::HostCtlException;
 using TarnCtl::Api::Session;
@@ -66,9 +65,7 @@ int NODI_Set(NODI_NodeId node, int instance, NODI_ParamList* params, int reserve
     if (params == nullptr || params->type != NODI_PARAM_LIST_INT || params->values.size() != 1) {
       return TARN_BAD_PARAM;
     }
-    TarnCtl::Store::Transaction transaction(session->db());
     TarnCtl::Store::Meta::SetEnsNode(session->db(), params->values[0]);
-    transaction.Commit();
   } catch (const HostCtlException&) {
     return TARN_FAILURE;
   }

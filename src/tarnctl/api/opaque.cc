@@ -29,8 +29,9 @@ class OpaqueState : public DVSwitchState {
       return *std::move(row);
     });
   }
+  void EnsureStillExists() { Row(); }
   [[noreturn]] void RefuseChange() {
-    Row();
+    EnsureStillExists();
     throw Instrument::Refused("Opaque switch " + name_ + " cannot be changed",
                               "(it belongs to another control plane)");
   }
@@ -43,23 +44,23 @@ class OpaqueState : public DVSwitchState {
   std::vector<std::string> Uplinks() override { return Row().uplinks; }
   std::string EnsName(bool change) override {
     if (change) RefuseChange();
-    Row();
+    EnsureStillExists();
     return portset_;
   }
 
   void AddDVPortUplink(const std::string&, const DVPortParam&) override { RefuseChange(); }
   void RemoveDVPortUplink(const std::string&) override { RefuseChange(); }
   std::vector<DVPortParam> DVPorts() override {
-    Row();
+    EnsureStillExists();
     return {};
   }
   std::string SwitchId() override {
-    Row();
+    EnsureStillExists();
     return "";
   }
   std::string SwitchName() override { return name_; }
   uint32_t Mtu() override {
-    Row();
+    EnsureStillExists();
     return Model::kDefaultMtu;
   }
   void SetMtu(uint16_t) override { RefuseChange(); }

@@ -6,13 +6,11 @@
 #include "tarnctl/model/limits.h"
 #include "tarnctl/model/teaming.h"
 #include "tarnctl/store/policy_codec.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
 using HostCtl::Network::NicTeamingPolicy;
 using Store::Layer;
-using Store::Transaction;
 
 namespace {
 
@@ -38,7 +36,7 @@ bool PortGroupImpl::IsValidPortGroup(const std::string& name) {
 PortGroupImpl::PortGroupImpl(const std::string& name)
     : state_(std::make_unique<State>(Api::Session::Acquire(), name)) {
   TARN_CALL(&state_->db(), PortGroupImpl, Instrument::Named(name), name);
-  state_->Row();
+  state_->EnsureStillExists();
 }
 
 PortGroupImpl::PortGroupImpl(std::unique_ptr<State> state) : state_(std::move(state)) {}
@@ -65,11 +63,9 @@ uint16_t PortGroupImpl::GetVlanId() {
 
 void PortGroupImpl::SetVlanId(uint16_t vlanId) {
   TARN_CALL_ON(*state_, SetVlanId, vlanId);
-  state_->Row();
+  state_->EnsureStillExists();
   Model::Check(Model::kVlanId, vlanId);
-  Transaction transaction(state_->db());
   Store::PortGroups::SetVlan(state_->db(), state_->name, vlanId);
-  transaction.Commit();
 }
 
 NicTeamingPolicy PortGroupImpl::GetTeamingPolicy() {
@@ -79,11 +75,9 @@ NicTeamingPolicy PortGroupImpl::GetTeamingPolicy() {
 
 void PortGroupImpl::SetTeamingPolicy(NicTeamingPolicy policy) {
   TARN_CALL_ON(*state_, SetTeamingPolicy, policy);
-  state_->Row();
+  state_->EnsureStillExists();
   Model::CheckTeamingPolicy(policy);
-  Transaction transaction(state_->db());
   Store::PortGroups::SetPolicy(state_->db(), state_->name, Store::EncodeTeamingPolicy(policy));
-  transaction.Commit();
 }
 
 }  // namespace TarnCtl::Network

@@ -23,6 +23,8 @@ struct PortGroupImpl::State {
   Instrument::Target CallTarget() const { return Instrument::On(name); }
   // The running row; refuses when the port group no longer exists.
   const Store::PortGroups::Row& Row();
+  // Refuses when the port group no longer exists.
+  void EnsureStillExists() { Row(); }
 
   std::shared_ptr<Api::Session> session;
   std::string name;

@@ -13,6 +13,8 @@ void RemoveStandardSwitch(Store::Db& db, const std::string& name) {
   if (const int64_t used = Store::Standard::ClientCount(db, name); used > 0) {
     throw Refused("Virtual switch " + name + " has " + std::to_string(used) + " ports in use");
   }
+  // Administration makes this change outside any operation's savepoint:
+  // it is made whole here.
   Store::Transaction transaction(db);
   Store::Standard::Delete(db, name);
   transaction.Commit();
@@ -22,6 +24,8 @@ void RemoveDVSwitch(Store::Db& db, const std::string& name, const std::string& p
   if (const int64_t used = Store::Distributed::PortsInUse(db, name); used > 0) {
     throw Refused("DVS " + name + " has " + std::to_string(used) + " ports in use");
   }
+  // Administration makes this change outside any operation's savepoint:
+  // it is made whole here.
   Store::Transaction transaction(db);
   Store::Distributed::Delete(db, name, portset);
   transaction.Commit();

@@ -7,16 +7,13 @@
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/reset.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
 void VirtualSwitchInfoImpl::RestoreVirtualSwitches() {
   Store::Db& db = state_->db();
   TARN_CALL(&db, RestoreVirtualSwitches, Instrument::Nothing());
-  Store::Transaction transaction(db);
   Store::Reset::RestoreStandard(db);
-  transaction.Commit();
 }
 
 void VirtualSwitchInfoImpl::RestoreDVSwitches(const std::string& cacheFile) {
@@ -26,9 +23,7 @@ void VirtualSwitchInfoImpl::RestoreDVSwitches(const std::string& cacheFile) {
     throw Instrument::Refused("Cannot open distributed switch cache " + cacheFile,
                               "(the cache is " + NetworkInfoImpl::DefaultDVSCacheFile + ")");
   }
-  Store::Transaction transaction(db);
   Store::Reset::RestoreDistributed(db);
-  transaction.Commit();
 }
 
 }  // namespace TarnCtl::Network

@@ -11,7 +11,8 @@
 //    committed when it ends, or when the process exits through exit() while
 //    it is open; nothing is when the process dies otherwise (killed,
 //    aborted): the next opener finds the host as it was before. Each
-//    operation inside it is a savepoint, undone whole when it fails.
+//    operation inside it that may change the host is a savepoint, undone
+//    whole when it fails: its entry (instrument/call.h) opens it.
 //  - A host file that the opening made is reported once on standard error:
 //    "created a new default host at PATH".
 //  - A forked child does not use its parent's session (Current() is null

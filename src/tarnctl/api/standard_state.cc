@@ -26,17 +26,17 @@ const Store::Standard::Row& StandardState::Row() {
 }
 
 uint32_t StandardState::UsedPorts() {
-  Row();
+  EnsureStillExists();
   return static_cast<uint32_t>(Store::Standard::UsedPorts(db(), name_));
 }
 
 std::vector<std::string> StandardState::Uplinks() {
-  Row();
+  EnsureStillExists();
   return Store::Standard::Uplinks(db(), Layer::kRunning, name_);
 }
 
 std::string StandardState::EnsName(bool) {
-  Row();
+  EnsureStillExists();
   return name_;
 }
 

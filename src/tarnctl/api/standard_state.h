@@ -15,6 +15,8 @@ class StandardState : public Network::PortsetImpl::State {
 
   // The running row; refuses when the switch no longer exists.
   const Store::Standard::Row& Row();
+  // Refuses when the switch no longer exists.
+  void EnsureStillExists() { Row(); }
   const std::string& name() const { return name_; }
 
   Instrument::Target CallTarget() const override { return Instrument::On(name_); }

@@ -6,7 +6,6 @@
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/model/names.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
@@ -29,9 +28,7 @@ void VirtualSwitchInfoImpl::LoadUplinkTimeoutConfig(const std::string& portset, 
   Store::Db& db = state_->db();
   TARN_CALL(&db, LoadUplinkTimeoutConfig, Named(portset), portset, lagId, uplink);
   CheckPortset(db, portset);
-  Store::Transaction transaction(db);
   Store::Timeouts::LoadUplinks(db, {portset, uplink, lagId, 0});
-  transaction.Commit();
 }
 
 std::vector<HN::UplinkTimeoutConfig> VirtualSwitchInfoImpl::GetUplinkTimeoutConfig(
@@ -46,9 +43,7 @@ void VirtualSwitchInfoImpl::LoadLagTimeoutConfig(const std::string& portset, uin
   Store::Db& db = state_->db();
   TARN_CALL(&db, LoadLagTimeoutConfig, Named(portset), portset, lagId);
   CheckPortset(db, portset);
-  Store::Transaction transaction(db);
   Store::Timeouts::LoadLags(db, {portset, lagId, 0});
-  transaction.Commit();
 }
 
 std::vector<HN::LagTimeoutConfig> VirtualSwitchInfoImpl::GetLagTimeoutConfig(

@@ -6,26 +6,22 @@
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/store/meta.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
 using Api::StandardState;
 using Instrument::Refused;
 using Store::Layer;
-using Store::Transaction;
 
 void VirtualSwitchImpl::AddUplink(const std::string& pnic, bool flag) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, AddUplink, pnic, flag);
-  sw.Row();
+  sw.EnsureStillExists();
   Store::Db& db = sw.db();
   Model::CheckFreePnic(db, pnic);
-  Transaction transaction(db);
   const int64_t seq = Store::Meta::NextSeq(db);
   Store::Standard::Link(db, Layer::kRunning, pnic, sw.name(), seq);
   if (flag) Store::Standard::Link(db, Layer::kStored, pnic, sw.name(), seq);
-  transaction.Commit();
 }
 
 void VirtualSwitchImpl::RemoveUplink(const std::string& pnic, bool configOnly) {
@@ -37,28 +33,24 @@ void VirtualSwitchImpl::RemoveUplink(const std::string& pnic, bool configOnly) {
       throw Refused(pnic + " is not linked to " + sw.name(), "in the stored configuration");
     }
   } else {
-    sw.Row();
+    sw.EnsureStillExists();
     if (!Store::Standard::Linked(db, Layer::kRunning, pnic, sw.name())) {
       throw Refused(pnic + " is not linked to " + sw.name());
     }
   }
-  Transaction transaction(db);
   Store::Standard::Unlink(db, pnic, sw.name(), configOnly);
-  transaction.Commit();
 }
 
 void VirtualSwitchImpl::RestoreUplinks() {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, RestoreUplinks);
-  sw.Row();
+  sw.EnsureStillExists();
   Store::Db& db = sw.db();
   const auto missing = Store::Standard::UnrestoredLinks(db, sw.name());
-  Transaction transaction(db);
   for (const auto& [pnic, seq] : missing) {
     Model::CheckFreePnic(db, pnic);
     Store::Standard::Link(db, Layer::kRunning, pnic, sw.name(), seq);
   }
-  transaction.Commit();
 }
 
 }  // namespace TarnCtl::Network

@@ -10,7 +10,6 @@
 #include "tarnctl/model/words.h"
 #include "tarnctl/store/meta.h"
 #include "tarnctl/store/policy_codec.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Network {
 
@@ -18,19 +17,6 @@ using Api::StandardState;
 using HostCtl::Network::NicTeamingPolicy;
 using Instrument::Refused;
 using Store::Layer;
-using Store::Transaction;
-
-namespace {
-
-// Applies `change` to the switch in a transaction of its own.
-template <typename Change>
-void Update(StandardState& sw, Change change) {
-  Transaction transaction(sw.db());
-  change(sw.db(), sw.name());
-  transaction.Commit();
-}
-
-}  // namespace
 
 VirtualSwitchImpl::VirtualSwitchImpl(std::unique_ptr<PortsetImpl::State> state)
     : PortsetImpl(std::move(state)) {}
@@ -46,7 +32,7 @@ int32_t VirtualSwitchImpl::ParseCdpStatus(const std::string& word) {
 std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> VirtualSwitchImpl::GetPortGroups() {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, GetPortGroups);
-  sw.Row();
+  sw.EnsureStillExists();
   std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> groups;
   for (auto& group : Store::PortGroups::OnSwitch(sw.db(), Layer::kRunning, sw.name())) {
     groups.push_back(std::make_unique<PortGroupImpl>(std::make_unique<PortGroupImpl::State>(
@@ -59,7 +45,7 @@ std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
     const std::string& name) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, AddPortGroup, name);
-  sw.Row();
+  sw.EnsureStillExists();
   Model::CheckName(Model::NameKind::kPortGroup, name);
   Store::Db& db = sw.db();
   if (Store::PortGroups::Exists(db, Layer::kRunning, name)) {
@@ -67,10 +53,8 @@ std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
   }
   const Store::PortGroups::Row row{sw.name(), 0,
                                    Store::EncodeTeamingPolicy(Model::NewPortGroupPolicy())};
-  Transaction transaction(db);
   const int64_t seq = Store::Meta::NextSeq(db);
   for (Layer layer : Store::kBothLayers) Store::PortGroups::Insert(db, layer, name, seq, row);
-  transaction.Commit();
   // Read back when asked: clients waiting for a port group of this name
   // are on it now.
   return std::make_unique<PortGroupImpl>(std::make_unique<PortGroupImpl::State>(sw.session, name));
@@ -79,7 +63,7 @@ std::unique_ptr<HostCtl::Network::PortGroup> VirtualSwitchImpl::AddPortGroup(
 void VirtualSwitchImpl::RemovePortGroup(const std::string& name) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, RemovePortGroup, name);
-  sw.Row();
+  sw.EnsureStillExists();
   Store::Db& db = sw.db();
   const auto group = Store::PortGroups::Find(db, Layer::kRunning, name);
   if (!group || group->switchName != sw.name()) {
@@ -88,9 +72,7 @@ void VirtualSwitchImpl::RemovePortGroup(const std::string& name) {
   if (const int64_t used = Store::PortGroups::ClientCount(db, name); used > 0) {
     throw Refused("Portgroup " + name + " has " + std::to_string(used) + " ports in use");
   }
-  Update(sw, [&](Store::Db& db, const std::string& switchName) {
-    Store::PortGroups::Delete(db, name, switchName);
-  });
+  Store::PortGroups::Delete(db, name, sw.name());
 }
 
 NicTeamingPolicy VirtualSwitchImpl::GetTeamingPolicy() {
@@ -102,11 +84,9 @@ NicTeamingPolicy VirtualSwitchImpl::GetTeamingPolicy() {
 void VirtualSwitchImpl::SetTeamingPolicy(NicTeamingPolicy policy) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, SetTeamingPolicy, policy);
-  sw.Row();
+  sw.EnsureStillExists();
   Model::CheckTeamingPolicy(policy);
-  Update(sw, [&](Store::Db& db, const std::string& name) {
-    Store::Standard::SetPolicy(db, name, Store::EncodeTeamingPolicy(policy));
-  });
+  Store::Standard::SetPolicy(sw.db(), sw.name(), Store::EncodeTeamingPolicy(policy));
 }
 
 int32_t VirtualSwitchImpl::GetCdpStatus() {
@@ -118,11 +98,9 @@ int32_t VirtualSwitchImpl::GetCdpStatus() {
 void VirtualSwitchImpl::SetCdpStatus(int32_t status) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, SetCdpStatus, status);
-  sw.Row();
+  sw.EnsureStillExists();
   Model::Check(Model::kCdpStatus, status);
-  Update(sw, [&](Store::Db& db, const std::string& name) {
-    Store::Standard::SetCdp(db, name, status);
-  });
+  Store::Standard::SetCdp(sw.db(), sw.name(), status);
 }
 
 uint32_t VirtualSwitchImpl::GetMTU() {
@@ -134,10 +112,9 @@ uint32_t VirtualSwitchImpl::GetMTU() {
 void VirtualSwitchImpl::SetMTU(uint16_t mtu) {
   StandardState& sw = Api::AsStandard(*state_);
   TARN_CALL_ON(sw, SetMTU, mtu);
-  sw.Row();
+  sw.EnsureStillExists();
   Model::Check(Model::kMtu, mtu);
-  Update(sw,
-         [&](Store::Db& db, const std::string& name) { Store::Standard::SetMtu(db, name, mtu); });
+  Store::Standard::SetMtu(sw.db(), sw.name(), mtu);
 }
 
 }  // namespace TarnCtl::Network

@@ -1,5 +1,8 @@
 #include "tarnctl/instrument/call.h"
 
+#include <cassert>
+#include <exception>
+
 #include "tarnctl/instrument/faults.h"
 #include "tarnctl/store/db.h"
 
@@ -30,9 +33,9 @@ Target Of(const char* record) {
 }
 
 Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault)
-    : db_(db), previous_(g_running) {
+    : db_(db), previous_(g_running), uncaught_(std::uncaught_exceptions()) {
   const Operation& operation = Describe(op);
-  g_running = operation.name.c_str();
+  g_running = operation.name;
   if (db_ != nullptr) {
     previousContext_ = db_->context();
     db_->set_context(g_running);
@@ -40,7 +43,7 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   if (TraceOn()) {
     std::string line;
     if (!target.record.empty()) line.append(target.record).append("::");
-    line += operation.name + '(' + args + ')';
+    line.append(operation.name).append(1, '(').append(args).append(1, ')');
     if (!target.on.empty()) {
       line += " on ";
       AppendEscaped(line, std::string(target.on));
@@ -49,21 +52,37 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   }
   if (db_ == nullptr) return;
   try {
-    auto fault = TakeFault(*db_, g_running, target.names);
-    if (!fault) return;
-    if (onFault == OnFault::kReport) {
+    // A fault is used up even when it makes the operation fail: it is taken
+    // before the savepoint that a failure undoes.
+    if (auto fault = TakeFault(*db_, g_running, target.names)) {
+      if (onFault == OnFault::kThrow) throw *fault;
       failed_ = true;
-      return;
     }
-    throw *fault;
+    if (operation.access == kChanges) savepoint_.emplace(*db_);
+    changes_ = db_->ChangeCount();
+    reads_ = operation.access != kChanges;
   } catch (...) {
-    db_->set_context(previousContext_);
-    g_running = previous_;
+    Leave();
     throw;
   }
 }
 
-Call::~Call() {
+Call::~Call() noexcept(false) {
+  // The registry must say which operations change the host: only those are
+  // undone whole.
+  assert(db_ == nullptr || !reads_ || db_->ChangeCount() == changes_);
+  try {
+    if (savepoint_ && std::uncaught_exceptions() == uncaught_) savepoint_->Commit();
+  } catch (...) {
+    savepoint_.reset();
+    Leave();
+    throw;
+  }
+  savepoint_.reset();
+  Leave();
+}
+
+void Call::Leave() {
   if (db_ != nullptr) db_->set_context(previousContext_);
   g_running = previous_;
 }

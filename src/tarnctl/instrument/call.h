@@ -1,5 +1,7 @@
 // The entry of every library operation: one trace line (trace.h), then the
-// armed faults (faults.h).
+// armed faults (faults.h), then, for an operation that may change the host
+// (operations.h), a savepoint: everything it changes is kept when it returns
+// and undone when it throws.
 //
 //   TARN_CALL(db, SetVlanId, On(name), vlanId);
 //
@@ -11,6 +13,7 @@
 #pragma once
 
 #include <array>
+#include <optional>
 #include <source_location>
 #include <string>
 #include <string_view>
@@ -18,10 +21,7 @@
 
 #include "tarnctl/instrument/operations.h"
 #include "tarnctl/instrument/trace.h"
-
-namespace TarnCtl::Store {
-class Db;
-}
+#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Instrument {
 
@@ -57,11 +57,14 @@ class Call {
   // Traces the call (when the trace is on, with the text `args()` returns)
   // and applies the faults armed on `db`'s host (none when `db` is null).
   // With kThrow a fault throws its HostCtlException; with kReport it only
-  // sets failed().
+  // sets failed(). Then opens the savepoint of an operation that changes
+  // the host.
   template <typename Args>
   Call(Store::Db* db, Op op, const Target& target, Args args, OnFault onFault = OnFault::kThrow)
       : Call(db, op, target, TraceOn() ? args() : std::string(), onFault) {}
-  ~Call();
+  // Commits the savepoint when the operation returns, which throws what a
+  // failed commit met; undoes it when the operation throws.
+  ~Call() noexcept(false);
   Call(const Call&) = delete;
   Call& operator=(const Call&) = delete;
 
@@ -71,11 +74,16 @@ class Call {
 
  private:
   Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault);
+  void Leave();
 
   Store::Db* db_;
   const char* previous_;
   const char* previousContext_ = nullptr;
   bool failed_ = false;
+  int uncaught_;  // exceptions in flight when the call began
+  bool reads_ = false;
+  int64_t changes_ = 0;  // the connection's changes when the operation began
+  std::optional<Store::Transaction> savepoint_;
 };
 
 // An administration step that is not a library operation (tarnhost's
@@ -95,11 +103,14 @@ class Scope {
 };
 
 // True when `function` (a function's name as the compiler writes it) is the
-// function `operation`, a constructor of that class included.
+// function `operation`, a constructor of that class included. Compilers
+// differ in what they write before the name: a qualifier ("X::"), or the
+// return type, with or without a space ("char *f(...)", "char* f(...)").
 constexpr bool IsFunction(std::string_view function, std::string_view operation) {
   for (size_t at = function.find(operation); at != std::string_view::npos;
        at = function.find(operation, at + 1)) {
-    const bool start = at == 0 || function[at - 1] == ':' || function[at - 1] == ' ';
+    const bool start =
+        at == 0 || std::string_view(": *&").find(function[at - 1]) != std::string_view::npos;
     const size_t end = at + operation.size();
     if (start && end < function.size() && function[end] == '(') return true;
   }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <vector>
 
 namespace TarnCtl::Instrument {
 
@@ -31,48 +32,18 @@ size_t Distance(std::string_view a, std::string_view b) {
   return row[b.size()];
 }
 
-// Calls `each` with every name of a space-separated list.
-template <typename Each>
-void ForEachWord(std::string_view list, Each each) {
-  for (size_t at = 0; at < list.size();) {
-    size_t end = list.find(' ', at);
-    if (end == std::string_view::npos) end = list.size();
-    each(list.substr(at, end - at));
-    at = end + 1;
-  }
-}
-
 }  // namespace
 
-const std::vector<Operation>& Operations() {
-  static const std::vector<Operation> operations = [] {
-    std::vector<Operation> all;
-    ForEachWord(kOperationNames, [&](std::string_view name) {
-      all.push_back({static_cast<Op>(all.size()), std::string(name), kNoTarget, true});
-    });
-    auto find = [&](std::string_view name) {
-      return std::lower_bound(all.begin(), all.end(), name,
-                              [](const Operation& o, std::string_view n) { return o.name < n; });
-    };
-    for (const TargetList& list : kTargetLists) {
-      ForEachWord(list.operations,
-                  [&](std::string_view name) { find(name)->targets |= list.kinds; });
-    }
-    ForEachWord(kUnfaultable, [&](std::string_view name) { find(name)->faultable = false; });
-    return all;
-  }();
-  return operations;
-}
-
 const Operation& Describe(Op op) {
-  return Operations()[static_cast<size_t>(op)];
+  return kOperations[static_cast<size_t>(op)];
 }
 
 const Operation* FindOperation(std::string_view name) {
-  const auto& operations = Operations();
-  const auto found = std::lower_bound(
-      operations.begin(), operations.end(), name,
-      [](const Operation& operation, std::string_view key) { return operation.name < key; });
+  const auto operations = Operations();
+  const auto found = std::lower_bound(operations.begin(), operations.end(), name,
+                                      [](const Operation& operation, std::string_view key) {
+                                        return std::string_view(operation.name) < key;
+                                      });
   return found != operations.end() && found->name == name ? &*found : nullptr;
 }
 

@@ -1,14 +1,16 @@
-// The registry of the library's operations: each one's name (as the trace
-// writes it and as faults name it) and what a fault's target (`--on`) may
-// name for it. Every library entry point declares its operation with
-// TARN_CALL (call.h), which refuses to compile when the operation is not
-// registered or is not the function it is written in.
+// The registry of the library's operations, one table: each one's name (as
+// the trace writes it and as faults name it), what a fault's target (`--on`)
+// may name for it, and whether it reads or changes the host or runs without
+// it. Every library entry point declares its operation with TARN_CALL
+// (call.h), which refuses to compile when the operation is not registered or
+// is not the function it is written in.
 #pragma once
 
+#include <iterator>
 #include <optional>
+#include <span>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace TarnCtl::Instrument {
 
@@ -25,76 +27,138 @@ enum TargetKind : unsigned {
   kAnySwitch = kStandardSwitch | kDistributedSwitch | kOpaqueSwitch,
 };
 
-// Every operation, in name order, one space between names.
-inline constexpr std::string_view kOperationNames =
-    "ActivateEns AddDVPortUplink AddDVSwitch AddPortGroup AddUplink AddVirtualSwitch "
-    "DVPortImpl DeactivateEns GetAllPortGroupNames GetCdpStatus GetConfiguredPorts "
-    "GetConnectionId GetDVPortParams GetDVPorts GetDVSwitchByName GetDVSwitchId GetDVSwitches "
-    "GetDefaultPolicy GetEnsMode GetIntParamList GetLagTimeoutConfig GetMTU GetName "
-    "GetNumPorts GetOpaqueSwitches GetParam GetPortGroups GetPortId GetPorts GetPortsetById "
-    "GetSwitchName GetTeamingPolicy GetUplinkTimeoutConfig GetUplinks GetUsedPorts "
-    "GetVirtualSwitchById GetVirtualSwitchInfo GetVirtualSwitches GetVlanId IsInUse IsValid "
-    "IsValidPortGroup IsValidVirtualSwitch LoadLagTimeoutConfig LoadUplinkTimeoutConfig "
-    "NODI_CheckSig NODI_ParamListDestroy NODI_Set NetworkInfoImpl ParseCdpStatus "
-    "PortGroupImpl ReassociateEnsUplinks Refresh RemoveDVPortUplink RemovePortGroup "
-    "RemoveUplink RemoveVirtualSwitch RestoreDVSwitches RestoreUplinks RestoreVirtualSwitches "
-    "SetCdpStatus SetConnectionId SetMTU SetMaxActiveUplinks SetTeamingPolicy SetUplinkOrder "
-    "SetVlanId SwitchExists TARN_ReturnStatusToString TestDVPortNota VirtualSwitchInfoImpl";
-
-// The operations whose targets are of each kind (an operation on more than
-// one kind of object is in more than one list); the others have none.
-struct TargetList {
-  unsigned kinds;
-  std::string_view operations;
+// How an operation uses the host.
+enum class Access : unsigned char {
+  kNone,     // runs without a host (no fault can hit it)
+  kReads,    // reads the host, or leaves it alone
+  kChanges,  // may change the host: runs in a savepoint of its own (call.h)
 };
-inline constexpr TargetList kTargetLists[] = {
-    {kAnySwitch,
-     "ActivateEns DeactivateEns GetConfiguredPorts GetEnsMode GetMTU GetName GetNumPorts "
-     "GetUplinks GetUsedPorts ReassociateEnsUplinks SetMTU"},
-    {kStandardSwitch,
-     "AddPortGroup AddUplink GetCdpStatus GetPortGroups GetTeamingPolicy RemovePortGroup "
-     "RemoveUplink RestoreUplinks SetCdpStatus SetTeamingPolicy"},
-    {kDistributedSwitch | kOpaqueSwitch,
-     "AddDVPortUplink GetDVPortParams GetDVPorts GetDVSwitchId GetSwitchName "
-     "RemoveDVPortUplink"},
-    {kPortGroup, "GetName GetPorts GetTeamingPolicy GetVlanId SetTeamingPolicy SetVlanId"},
-    {kDVPort, "GetConnectionId GetParam GetPortId IsInUse IsValid SetConnectionId TestDVPortNota"},
-    {kNameArgument,
-     "AddDVSwitch AddVirtualSwitch DVPortImpl GetDVSwitchByName GetLagTimeoutConfig "
-     "GetPortsetById GetUplinkTimeoutConfig GetVirtualSwitchById IsValidPortGroup "
-     "IsValidVirtualSwitch LoadLagTimeoutConfig LoadUplinkTimeoutConfig ParseCdpStatus "
-     "PortGroupImpl RemoveVirtualSwitch RestoreDVSwitches SwitchExists"},
-    {kRecord, "GetDefaultPolicy"},
+using enum Access;
+
+struct Operation {
+  constexpr Operation(const char* name, unsigned targets, Access access = kReads)
+      : name(name), targets(targets), access(access), faultable(access != Access::kNone) {}
+
+  const char* name;  // as the trace writes it and faults name it
+  unsigned targets;  // TargetKind bits: what a fault's `--on` may name
+  Access access;
+  bool faultable;
 };
 
-// Calls made without a host: they can never fail on purpose.
-inline constexpr std::string_view kUnfaultable = "NODI_ParamListDestroy TARN_ReturnStatusToString";
+// Every operation, in name order.
+inline constexpr Operation kOperations[] = {
+    {"ActivateEns", kAnySwitch, kChanges},
+    {"AddDVPortUplink", kDistributedSwitch | kOpaqueSwitch, kChanges},
+    {"AddDVSwitch", kNameArgument, kChanges},
+    {"AddPortGroup", kStandardSwitch, kChanges},
+    {"AddUplink", kStandardSwitch, kChanges},
+    {"AddVirtualSwitch", kNameArgument, kChanges},
+    {"DVPortImpl", kNameArgument},
+    {"DeactivateEns", kAnySwitch, kChanges},
+    {"GetAllPortGroupNames", kNoTarget},
+    {"GetCdpStatus", kStandardSwitch},
+    {"GetConfiguredPorts", kAnySwitch},
+    {"GetConnectionId", kDVPort},
+    {"GetDVPortParams", kDistributedSwitch | kOpaqueSwitch},
+    {"GetDVPorts", kDistributedSwitch | kOpaqueSwitch},
+    {"GetDVSwitchByName", kNameArgument},
+    {"GetDVSwitchId", kDistributedSwitch | kOpaqueSwitch},
+    {"GetDVSwitches", kNoTarget},
+    {"GetDefaultPolicy", kRecord},
+    {"GetEnsMode", kAnySwitch},
+    {"GetIntParamList", kNoTarget},
+    {"GetLagTimeoutConfig", kNameArgument},
+    {"GetMTU", kAnySwitch},
+    {"GetName", kAnySwitch | kPortGroup},
+    {"GetNumPorts", kAnySwitch},
+    {"GetOpaqueSwitches", kNoTarget},
+    {"GetParam", kDVPort},
+    {"GetPortGroups", kStandardSwitch},
+    {"GetPortId", kDVPort},
+    {"GetPorts", kPortGroup},
+    {"GetPortsetById", kNameArgument},
+    {"GetSwitchName", kDistributedSwitch | kOpaqueSwitch},
+    {"GetTeamingPolicy", kStandardSwitch | kPortGroup},
+    {"GetUplinkTimeoutConfig", kNameArgument},
+    {"GetUplinks", kAnySwitch},
+    {"GetUsedPorts", kAnySwitch},
+    {"GetVirtualSwitchById", kNameArgument},
+    {"GetVirtualSwitchInfo", kNoTarget},
+    {"GetVirtualSwitches", kNoTarget},
+    {"GetVlanId", kPortGroup},
+    {"IsInUse", kDVPort},
+    {"IsValid", kDVPort},
+    {"IsValidPortGroup", kNameArgument},
+    {"IsValidVirtualSwitch", kNameArgument},
+    {"LoadLagTimeoutConfig", kNameArgument, kChanges},
+    {"LoadUplinkTimeoutConfig", kNameArgument, kChanges},
+    {"NODI_CheckSig", kNoTarget},
+    {"NODI_ParamListDestroy", kNoTarget, kNone},
+    {"NODI_Set", kNoTarget, kChanges},
+    {"NetworkInfoImpl", kNoTarget},
+    {"ParseCdpStatus", kNameArgument},
+    {"PortGroupImpl", kNameArgument},
+    {"ReassociateEnsUplinks", kAnySwitch, kChanges},
+    {"Refresh", kNoTarget},
+    {"RemoveDVPortUplink", kDistributedSwitch | kOpaqueSwitch, kChanges},
+    {"RemovePortGroup", kStandardSwitch, kChanges},
+    {"RemoveUplink", kStandardSwitch, kChanges},
+    {"RemoveVirtualSwitch", kNameArgument, kChanges},
+    {"RestoreDVSwitches", kNameArgument, kChanges},
+    {"RestoreUplinks", kStandardSwitch, kChanges},
+    {"RestoreVirtualSwitches", kNoTarget, kChanges},
+    {"SetCdpStatus", kStandardSwitch, kChanges},
+    {"SetConnectionId", kDVPort, kChanges},
+    {"SetMTU", kAnySwitch, kChanges},
+    {"SetMaxActiveUplinks", kNoTarget},
+    {"SetTeamingPolicy", kStandardSwitch | kPortGroup, kChanges},
+    {"SetUplinkOrder", kNoTarget},
+    {"SetVlanId", kPortGroup, kChanges},
+    {"SwitchExists", kNameArgument},
+    {"TARN_ReturnStatusToString", kNoTarget, kNone},
+    {"TestDVPortNota", kDVPort, kChanges},
+    {"VirtualSwitchInfoImpl", kNoTarget},
+};
 
-// The position of `name` in kOperationNames, or -1.
+// The position of `name` in kOperations, or -1.
 constexpr int OperationIndex(std::string_view name) {
-  int index = 0;
-  for (size_t at = 0; at < kOperationNames.size(); ++index) {
-    size_t end = kOperationNames.find(' ', at);
-    if (end == std::string_view::npos) end = kOperationNames.size();
-    if (kOperationNames.substr(at, end - at) == name) return index;
-    at = end + 1;
+  for (size_t i = 0; i < std::size(kOperations); ++i) {
+    if (kOperations[i].name == name) return static_cast<int>(i);
   }
   return -1;
 }
 
-// An operation, by its position in kOperationNames.
-enum class Op : int {};
+// The table is searched by halving (FindOperation), and an operation's
+// position is its Op: the names are sorted and unique, each a C++ name.
+constexpr bool WellFormed(const Operation& operation) {
+  const std::string_view name = operation.name;
+  if (name.empty() || (name[0] >= '0' && name[0] <= '9')) return false;
+  for (const char c : name) {
+    const bool word =
+        (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || c == '_';
+    if (!word) return false;
+  }
+  // A call without a host has nothing to be matched on.
+  return operation.access != kNone || operation.targets == kNoTarget;
+}
+static_assert(
+    [] {
+      for (size_t i = 0; i < std::size(kOperations); ++i) {
+        if (!WellFormed(kOperations[i])) return false;
+        if (i > 0 && std::string_view(kOperations[i - 1].name) >= kOperations[i].name) return false;
+      }
+      return true;
+    }(),
+    "kOperations must list well-formed operations in strict name order");
 
-struct Operation {
-  Op op;
-  std::string name;
-  unsigned targets;  // TargetKind bits
-  bool faultable;
-};
+// An operation, by its position in kOperations.
+enum class Op : int {};
 
 const Operation& Describe(Op op);
 // Every operation, in name order.
-const std::vector<Operation>& Operations();
+constexpr std::span<const Operation> Operations() {
+  return kOperations;
+}
 const Operation* FindOperation(std::string_view name);
 // The registered name nearest to `name` (for "did you mean"), if any is
 // close enough to be a likely misspelling.
