@@ -282,6 +282,17 @@ replaced) survive a dump too.
   Faults
     (none)
 
+A switch whose ports are all used (an uplink and clients; DVPorts) takes no
+more clients or DVPorts.
+
+  $ tarnhost pnic add pnic9 && orvocfg-vswitch -a vsF:8 && orvocfg-vswitch -L pnic9 vsF &&
+  > orvocfg-vswitch -A pgF vsF && tarnhost dvs add dF --ports 8
+  $ for i in 1 2 3 4 5 6 7; do tarnhost client add pgF c$i; done
+  $ for i in 1 2 3 4 5 6 7 8; do tarnhost dvport add dF $i; done
+  $ refused tarnhost client add pgF c8; refused tarnhost dvport add dF 9
+  status 1 tarnhost: Switch vsF has no free port
+  status 1 tarnhost: Switch dF has no free port
+
 Load and dump show their progress when standard error is a terminal: one
 line that overwrites itself, ended by a newline; nothing otherwise.
 
