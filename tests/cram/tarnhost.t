@@ -289,7 +289,8 @@ replaced) survive a dump too.
     (none)
 
 A switch whose ports are all used (an uplink and clients; DVPorts) takes no
-more clients or DVPorts.
+more clients or DVPorts. The lists of clients and DVPorts, of one port group or
+switch only.
 
   $ tarnhost pnic add pnic9 && orvocfg-vswitch -a vsF:8 && orvocfg-vswitch -L pnic9 vsF &&
   > orvocfg-vswitch -A pgF vsF && tarnhost dvs add dF --ports 8
@@ -298,6 +299,14 @@ more clients or DVPorts.
   $ refused tarnhost client add pgF c8; refused tarnhost dvport add dF 9
   status 1 tarnhost: Switch vsF has no free port
   status 1 tarnhost: Switch dF has no free port
+  $ for what in 'client Management' 'client pgF' 'client pg' 'dvport dA' 'dvport dF' 'dvport d'; do
+  >   set -- $what; echo "$1 list $2: $(tarnhost $1 list $2 | cut -f2 | paste -sd' ')"; done
+  client list Management: vm1
+  client list pgF: c1 c2 c3 c4 c5 c6 c7
+  client list pg: 
+  dvport list dA: 1
+  dvport list dF: 1 2 3 4 5 6 7 8
+  dvport list d: 
 
 Load and dump show their progress when standard error is a terminal: one
 line that overwrites itself, ended by a newline; nothing otherwise.
