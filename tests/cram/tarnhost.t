@@ -43,6 +43,16 @@ also with -h or --help after them (which wins over mistakes, but not over
   0 usage: tarnhost help ...|help: print this text, or the help of COMMAND
   2 tarnhost: unexpected argument x|usage: tarnhost fault add ...
   2 tarnhost: bad number for --mtu: "-h"|usage: tarnhost dvs add ...
+Help text is wrapped to 80 columns, which a line may fill exactly; usage
+lines are not wrapped.
+
+  $ for noun in $(sed -n 's/^  \([a-z][a-z-]*\) .*/\1/p' help | sort -u); do tarnhost help $noun; done |
+  >   grep -v -e '^usage:' -e '^       tarnhost' | awk 'length > 79 { print length ":" $0 }' | sort | uniq -c
+        1 80:  A line for each of the running state: its name, ports, used ports and uplinks.
+        1 80:  orvocfg-vswitch -G loads the matching records. The timeout is 0 to 255 and the
+        1 80:  orvocfg-vswitch -O loads the matching records. The timeout is 0 to 255 and the
+        3 80:  separated by a tab and lists within a field by commas; an empty field is none.
+        1 80:  used ports and uplinks. Fields are separated by a tab and lists within a field
   $ tarnhost --version
   tarnhost \d+\.\d+\.\d+ (re)
   $ tarnhost path | sed "s|$PWD|PWD|"
