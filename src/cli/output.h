@@ -8,4 +8,8 @@ namespace Cli {
 // comes later and sees every byte the run wrote.
 void CheckOutputAtExit();
 
+// Leaves the rest of the run's output unchecked: the usage text is written
+// as help, and after a usage error, whether or not it reaches the reader.
+void SkipOutputCheck();
+
 }  // namespace Cli

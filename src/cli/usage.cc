@@ -6,6 +6,8 @@
 #include <iostream>
 #include <iterator>
 
+#include "cli/output.h"
+
 namespace Cli {
 namespace {
 
@@ -107,6 +109,8 @@ void WriteLines(std::ostream& out, const char* const* first, const char* const* 
 }  // namespace
 
 void PrintUsage(int status) {
+  // Usage comes before any command ran: nothing else was written.
+  SkipOutputCheck();
   WriteLines(std::cout, std::begin(kLinesBeforeWildcard), std::end(kLinesBeforeWildcard));
   std::cout << "                              Use " << kAllPortGroups
             << " to set VLAN IDs on all portgroups\n";

@@ -4,14 +4,12 @@
 #include <signal.h>
 #include <sys/types.h>
 
-#include <charconv>
 #include <cstdint>
 #include <cstdlib>
 #include <fstream>
 #include <iostream>
 #include <limits>
 #include <optional>
-#include <string>
 
 #include "commands/commands.h"
 #include "hostctl/nodi.h"
@@ -25,19 +23,21 @@ constexpr const char kPidMaxFile[] = "/proc/sys/kernel/pid_max";
 // Version argument of the node interface's signature check.
 constexpr int kNodiSigVersion = 21;
 
-// The one number a file holds: decimal digits only, with white space around
-// them. A sign, other characters or a value beyond 32 bits give nothing
-// (operator>> would take "-1" and wrap it to a large unsigned value).
+// The unsigned decimal number at the start of a file, after white space;
+// what follows its digits is not looked at. Nothing when no digit comes
+// first (a sign included) or when the digits go beyond 32 bits.
 std::optional<uint32_t> ReadDecimal(std::istream& in) {
-  std::string word;
-  in >> word >> std::ws;
-  uint32_t value = 0;
-  const char* end = word.data() + word.size();
-  const auto [stop, error] = std::from_chars(word.data(), end, value);
-  if (error != std::errc() || stop != end || in.peek() != std::char_traits<char>::eof()) {
-    return std::nullopt;
+  in >> std::ws;
+  uint64_t value = 0;
+  bool digits = false;
+  for (int c = in.peek(); c >= '0' && c <= '9'; c = in.peek()) {
+    in.get();
+    digits = true;
+    // Once beyond 32 bits it stays there; the digits are still consumed.
+    if (value <= std::numeric_limits<uint32_t>::max()) value = value * 10 + (c - '0');
   }
-  return value;
+  if (!digits || value > std::numeric_limits<uint32_t>::max()) return std::nullopt;
+  return static_cast<uint32_t>(value);
 }
 
 // One above the largest process id of this system; when the kernel does not

@@ -25,6 +25,15 @@ A distributed switch answers the lookup; SwitchExists is not asked then.
   1
   0
 
+A switch and a port group that only the stored configuration holds (after a
+reboot, before a restore) do not exist yet.
+
+  $ tarnhost reboot
+  $ orvocfg-vswitch -C Guests; orvocfg-vswitch -c sw1; orvocfg-vswitch -r; orvocfg-vswitch -C Guests
+  0
+  0
+  1
+
 Library failures are the run-wide handler's: nothing on standard output.
 
   $ tarnhost fault add SwitchExists --detail 'switch table unreadable'

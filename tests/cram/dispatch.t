@@ -95,14 +95,20 @@ lookup's failure is reported.
 
 Standard output that cannot be written: one line on standard error and status
 1, for each command that prints. The same runs that can write are unchanged,
-and a command that prints nothing is not affected.
+and a command that prints nothing is not affected. The usage text, as help or
+after a usage error, is not checked: its status stays.
 
   $ tarnhost timeout uplink vswitch0 uplink1 1 1 && orvocfg-vswitch -O -s vswitch0
   $ for out in /dev/full /dev/null; do
-  >   for a in -l '-c vswitch0' '-C Management' '-b vswitch0' '-x vswitch0' -o -h; do
+  >   for a in -l '-c vswitch0' '-C Management' '-b vswitch0' '-x vswitch0' -o; do
   >     err=$(orvocfg-vswitch $a 2>&1 > $out); echo "$out: ${err:-no error}, status $?"
   >   done
   > done | uniq -c
-        7 /dev/full: orvocfg-vswitch: error writing standard output: No space left on device, status 1
-        7 /dev/null: no error, status 0
+        6 /dev/full: orvocfg-vswitch: error writing standard output: No space left on device, status 1
+        6 /dev/null: no error, status 0
   $ orvocfg-vswitch -a vswitch7 > /dev/full
+  $ for a in -h -t '-a -a vs1'; do orvocfg-vswitch $a > /dev/full; echo "status $?"; done
+  status 0
+  status 1
+  Error, only one command can be performed at a time.
+  status 1

@@ -42,6 +42,18 @@ After a command: a new switch gets ENS; -y -z uses the mode activation gave.
   ActivateEns(false, false) on vs1
   ReassociateEnsUplinks(true, false, 0, 0) on vs1
 
+-Y with -z, in either order: deactivation first, so the mode handed on is the
+one it left.
+
+  $ orvocfg-vswitch -z -Y vs1 && orvocfg-vswitch -y vs1 && orvocfg-vswitch -Y -z vs1
+  $ calls 'DeactivateEns|GetEnsMode|ReassociateEnsUplinks'
+  DeactivateEns() on vs1
+  GetEnsMode() on vs1
+  ReassociateEnsUplinks(false, false, 0, 0) on vs1
+  DeactivateEns() on vs1
+  GetEnsMode() on vs1
+  ReassociateEnsUplinks(false, false, 0, 0) on vs1
+
 Node failures end the run before ENS is touched, but NODI_Set's status is not
 examined; for -y a missing portset fails before the node is set.
 

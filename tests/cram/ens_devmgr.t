@@ -29,16 +29,15 @@ No PID file: the message goes to standard output and nothing is reassociated.
 
 A process of this test stands in for the device manager.
 
-  $ (sleep 120 & echo $! > sleeper; wait $!; echo "sleep ended with $?" > ended) 2>/dev/null &
-  $ until [ -s sleeper ]; do sleep 0.1; done; pid=$(cat sleeper)
+  $ sleep 120 & pid=$!
 
-A PID file that is not plain decimal digits naming a single process: 0, no
-number, too large, over 32 bits, and the sleeper's PID with a sign, with
-characters after it, or written as a negative or wider number that wraps to
-it. Nothing is signalled and nothing is reassociated.
+A PID file that cannot name a single process: 0, no number first (a sign
+included), a value at or above the largest process id or beyond 32 bits
+(also one that wraps to the sleeper's PID). Nothing is signalled and nothing
+is reassociated.
 
-  $ for text in 0 '' abc 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648 4294967296 \
-  >     "+$pid" "-$((4294967296 - pid))" "$((4294967296 + pid))" "${pid}x" "$pid $pid" "$pid.0"; do
+  $ for text in 0 '' abc x1 0x10 "$(cat /proc/sys/kernel/pid_max)" 2147483648 4294967296 \
+  >     "+$pid" "-$pid" " -$pid" "-$((4294967296 - pid))" "$((4294967296 + pid))"; do
   >   printf '%s\n' "$text" > "$pidfile"
   >   orvocfg-vswitch -f vswitch0 2>/dev/null; echo "status $?"
   > done | paste -d' ' - - | uniq -c
@@ -48,12 +47,15 @@ it. Nothing is signalled and nothing is reassociated.
   $ calls ReassociateEnsUplinks
   [1]
 
-Its PID, with white space around it, gets SIGHUP, and the reassociation is
-forced.
+The number at the start, after white space, names the process whatever
+follows it: each PID file below sends SIGHUP to a sleeper of its own (the
+shell's notes of their ends left out), and the reassociation is forced.
 
-  $ printf ' \n  %s \n\n' "$pid" > "$pidfile"
-  $ orvocfg-vswitch -f vswitch0
-  $ wait; pid=; cat ended
-  sleep ended with 129
-  $ calls ReassociateEnsUplinks
-  ReassociateEnsUplinks(false, true, 0, 0) on vswitch0
+  $ for format in ' \n  %s \n\n' '%s' '00%s' '%sabc' '%s 7\n' '%s.0' '%s-1\n'; do
+  >   printf "$format" "$pid" > "$pidfile"
+  >   orvocfg-vswitch -f vswitch0; wait "$pid" 2>/dev/null; echo "sleeper ended with $?"
+  >   sleep 120 & pid=$!
+  > done > ended 2>&1; grep -v Hangup ended | uniq -c
+        7 sleeper ended with 129
+  $ calls ReassociateEnsUplinks | uniq -c
+        7 ReassociateEnsUplinks(false, true, 0, 0) on vswitch0

@@ -64,6 +64,17 @@ A failed distributed switch restore: its message, and the rest goes on.
   RestoreUplinks() on vswitch0
   RestoreUplinks() on vs1
 
+A stored standard switch whose name a running distributed switch, or the
+portset of one, took meanwhile is left out with its port groups.
+
+  $ tarnhost init && orvocfg-vswitch -a vs1 && orvocfg-vswitch -a vs2 && orvocfg-vswitch -a vs3 &&
+  > orvocfg-vswitch -A pg1 vs1 && orvocfg-vswitch -A pg2 vs2 && orvocfg-vswitch -A pg3 vs3
+  $ tarnhost reboot && tarnhost dvs add vs1 --portset P1 && tarnhost dvs add dX --portset vs2
+  $ orvocfg-vswitch -r && tarnhost show --json | jq -c '.running | [.standardSwitches[] |
+  >   [.name, [.portGroups[].name]]], [.distributedSwitches[] | [.name, .portset]]'
+  [["vswitch0",["Management"]],["vs3",["pg3"]]]
+  [["vs1","P1"],["dX","vs2"]]
+
 On a host without standard switches -R does nothing.
 
   $ tarnhost init --empty

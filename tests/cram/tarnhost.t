@@ -43,6 +43,16 @@ also with -h or --help after them (which wins over mistakes, but not over
   0 usage: tarnhost help ...|help: print this text, or the help of COMMAND
   2 tarnhost: unexpected argument x|usage: tarnhost fault add ...
   2 tarnhost: bad number for --mtu: "-h"|usage: tarnhost dvs add ...
+Help text is wrapped to 80 columns, which a line may fill exactly; usage
+lines are not wrapped.
+
+  $ for noun in $(sed -n 's/^  \([a-z][a-z-]*\) .*/\1/p' help | sort -u); do tarnhost help $noun; done |
+  >   grep -v -e '^usage:' -e '^       tarnhost' | awk 'length > 79 { print length ":" $0 }' | sort | uniq -c
+        1 80:  A line for each of the running state: its name, ports, used ports and uplinks.
+        1 80:  orvocfg-vswitch -G loads the matching records. The timeout is 0 to 255 and the
+        1 80:  orvocfg-vswitch -O loads the matching records. The timeout is 0 to 255 and the
+        3 80:  separated by a tab and lists within a field by commas; an empty field is none.
+        1 80:  used ports and uplinks. Fields are separated by a tab and lists within a field
   $ tarnhost --version
   tarnhost \d+\.\d+\.\d+ (re)
   $ tarnhost path | sed "s|$PWD|PWD|"
@@ -63,6 +73,9 @@ of the command, or a hint where none is known, on standard error; status 2.
   > init --empty=yes
   > init --full
   > timeout lag vs0 1 -5
+  > system-switch add s1 --ports=-8
+  > fault add GetName --skip -1
+  > fault del -1
   > timeout add lag vs0 0x10 5
   > system-switch add s1 --ports 2147483648
   > system-switch add s1 --ports 64 --ports 64
@@ -83,6 +96,9 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: option --empty takes no value|usage: tarnhost init ...
   2 tarnhost: unknown option --full for init|usage: tarnhost init ...
   2 tarnhost: bad number for TIMEOUT: "-5"|usage: tarnhost timeout add lag ...
+  2 tarnhost: bad number for --ports: "-8"|usage: tarnhost system-switch add ...
+  2 tarnhost: bad number for --skip: "-1"|usage: tarnhost fault add ...
+  2 tarnhost: bad number for NUMBER: "-1"|usage: tarnhost fault del ...
   2 tarnhost: bad number for LAGID: "0x10"|usage: tarnhost timeout add lag ...
   2 tarnhost: number for --ports out of range: 2147483648|usage: tarnhost system-switch add ...
   2 tarnhost: option --ports given twice|usage: tarnhost system-switch add ...
@@ -281,6 +297,26 @@ replaced) survive a dump too.
   
   Faults
     (none)
+
+A switch whose ports are all used (an uplink and clients; DVPorts) takes no
+more clients or DVPorts. The lists of clients and DVPorts, of one port group or
+switch only.
+
+  $ tarnhost pnic add pnic9 && orvocfg-vswitch -a vsF:8 && orvocfg-vswitch -L pnic9 vsF &&
+  > orvocfg-vswitch -A pgF vsF && tarnhost dvs add dF --ports 8
+  $ for i in 1 2 3 4 5 6 7; do tarnhost client add pgF c$i; done
+  $ for i in 1 2 3 4 5 6 7 8; do tarnhost dvport add dF $i; done
+  $ refused tarnhost client add pgF c8; refused tarnhost dvport add dF 9
+  status 1 tarnhost: Switch vsF has no free port
+  status 1 tarnhost: Switch dF has no free port
+  $ for what in 'client Management' 'client pgF' 'client pg' 'dvport dA' 'dvport dF' 'dvport d'; do
+  >   set -- $what; echo "$1 list $2: $(tarnhost $1 list $2 | cut -f2 | paste -sd' ')"; done
+  client list Management: vm1
+  client list pgF: c1 c2 c3 c4 c5 c6 c7
+  client list pg: 
+  dvport list dA: 1
+  dvport list dF: 1 2 3 4 5 6 7 8
+  dvport list d: 
 
 Load and dump show their progress when standard error is a terminal: one
 line that overwrites itself, ended by a newline; nothing otherwise.

@@ -291,6 +291,10 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
   };
   const std::string sys0 = at("vswitch", "sys0"), management = at("portgroup", "Management");
   const std::string nextSeq = at("meta", "next_seq") + "/value";
+  int64_t largestSeq = 0;
+  for (const auto& [name, rows] : document["tables"].items()) {
+    for (const auto& row : rows) largestSeq = std::max<int64_t>(largestSeq, row.value("seq", 0));
+  }
   const struct {
     const char* what;
     std::string text;
@@ -331,6 +335,8 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
       {"counter at the end", with(nextSeq, "9223372036854775807"),
        "\"next_seq\" must be a number from 1 to"},
       {"counter behind", with(nextSeq, "3"), "is not beyond the largest seq"},
+      {"counter at the largest seq", with(nextSeq, std::to_string(largestSeq)),
+       "is not beyond the largest seq"},
   };
   for (const auto& c : cases) {
     const std::string message = Refusal([&] { LoadHost(host.db(), c.text); });
