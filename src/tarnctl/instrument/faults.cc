@@ -62,7 +62,7 @@ std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
   }
   if (!fails) return std::nullopt;
   const std::string message =
-      fault.message.empty() ? "Injected failure of " + std::string(operation) : fault.message;
+      fault.message.empty() ? std::string(Store::Faults::kDefaultMessage) : fault.message;
   // A detail of the fault's own is the whole detailed message: no
   // operation's name leads it.
   if (!fault.detail.empty()) return Refusal("", message, fault.detail);

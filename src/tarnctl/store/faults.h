@@ -12,6 +12,12 @@ class Db;
 
 namespace TarnCtl::Store::Faults {
 
+// What a fault armed without a message or detail of its own says.
+inline constexpr const char* kDefaultMessage = "injected fault";
+inline std::string DefaultDetail(const std::string& operation) {
+  return std::string(kDefaultMessage) + " in " + operation;
+}
+
 struct Row {
   int64_t id = 0;  // set by Insert
   std::string operation;
