@@ -272,6 +272,22 @@ without making a host: a busy or missing host offers none.
   
   none
 
+A name with a space is offered as it must be typed, however its start was
+quoted, by both programs; so are file names:
+
+  $ orvocfg-vswitch -A 'Guest Network' vswitch0; touch 'my dump.json'
+  $ t() { bash -c 'source "$0"; COMP_WORDS=(tarnhost "$@"); COMP_CWORD=$#; _tarnhost
+  >   printf "[%s]" "${COMPREPLY[@]}"; echo' "$TESTDIR/../../completions/tarnhost" "$@"; }
+  $ t client add G; t client add 'Guest\ N'; t client add "'Gu"; t load my
+  [Guest\ Network]
+  [Guest\ Network]
+  [Guest\ Network]
+  [my dump.json]
+  $ o -p G; o --pg='"Gu'; o -D 'Guest\ '
+  Guest\ Network
+  --pg=Guest\ Network
+  Guest\ Network
+
 States that only the library makes (ENS, events, loaded timeouts, DVPort
 uplinks; after a reboot, clients and DVPorts whose port group or switch was
 replaced) survive a dump too.
