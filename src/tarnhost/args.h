@@ -37,8 +37,9 @@ enum class Kind {
   DVPort,  // a DVPort id of the switch named before it
   OpaqueSwitch,
   Portset,
-  Object,  // any named object: switch, portset, port group, DVPort id
-  Fault,   // the number of an armed fault
+  Object,    // any named object: switch, portset, port group, DVPort id
+  Showable,  // what show NAME shows: switch, port group, DVS:PORTID
+  Fault,     // the number of an armed fault
 };
 
 struct OptionDef {

@@ -133,9 +133,12 @@ int Show(const Args& args) {
   if (json && dot) throw UsageError("--json and --dot exclude each other");
   std::optional<std::string> name;
   if (!args.Positionals().empty()) name = args.Positional(0);
-  if (name && !json) throw UsageError("NAME is shown with --json only");
+  if (name && dot) throw UsageError("NAME is shown as text or with --json, not as a graph");
   return Print(OnHost([&](Db& db) {
-    return json ? Admin::ShowJson(db, name) : dot ? Admin::ShowDot(db) : Admin::Show(db);
+    return json   ? Admin::ShowJson(db, name)
+           : dot  ? Admin::ShowDot(db)
+           : name ? Admin::Show(db, *name)
+                  : Admin::Show(db);
   }));
 }
 

@@ -43,6 +43,7 @@ constexpr HostKind kHostKinds[] = {
     {Kind::OpaqueSwitch, ObjectKind::kOpaqueSwitch, "opaque"},
     {Kind::Portset, ObjectKind::kPortset, "portset"},
     {Kind::Object, ObjectKind::kObject, "object"},
+    {Kind::Showable, ObjectKind::kShowable, "showable"},
     {Kind::Fault, ObjectKind::kFault, "fault"},
 };
 

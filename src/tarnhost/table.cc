@@ -53,16 +53,16 @@ const std::vector<Command>& Commands() {
                "linked to pnic0, with its port group Management.",
        .run = Init},
       {.words = {"show"},
-       .syntax = {.arguments = {{"NAME", Kind::Object, true}},
+       .syntax = {.arguments = {{"NAME", Kind::Showable, true}},
                   .options = {{.name = "json",
-                               .help = "as JSON; with NAME, only the switch or port group "
-                                       "of that name"},
+                               .help = "as JSON; with NAME, only what has that name"},
                               {.name = "dot", .help = "as a Graphviz graph"}}},
        .summary = "print the host in readable form, as JSON or as a graph",
        .help = "Prints the host file, the pnics, the running state, the stored configuration, "
                "the distributed switch cache, opaque switches, DVPorts, events and armed faults. "
                "docs/host.md describes the JSON; 'tarnhost show --dot | dot -Tsvg > host.svg' "
-               "draws the graph.",
+               "draws the graph. NAME shows one switch (of any kind), port group or DVPort "
+               "(DVS:PORTID), in both layers.",
        .run = Show},
       {.words = {"dump"},
        .summary = "write the whole host as JSON on standard output",

@@ -56,5 +56,24 @@ JSON: the layers by name, words for codes, texts that are not UTF-8 in hex.
   [{"dvs":"dvs0","portId":"100","connectionId":7,"clients":["vmA"]},{"dvs":"dvs0","portId":"101","connectionId":0,"clients":[]}]
   $ tarnhost show --json pg3 | jq -c '.portGroup.running | .teaming | {uplinkOrderSet, uplinkOrder, maxActive}'
   {"uplinkOrderSet":true,"uplinkOrder":["pnic2"],"maxActive":1}
+
+One object by its name, as JSON or text: a DVPort as DVS:PORTID; completion
+offers exactly the names show takes.
+
+  $ tarnhost show --json dvs0:100 | jq -c 'keys_unsorted, .dvport.clients'
+  ["name","dvport"]
+  ["vmA"]
+  $ tarnhost show overlay0; tarnhost show dvs0:100; tarnhost show pg3 | head -3
+  Opaque switch
+    overlay0: portset overlay0, 128 ports, 3 used, uplinks pnic3
+  DVPort
+    dvs0 port 100: connection id 7, clients vmA
+  Running state
+    On standard switch vs1:
+      Port group pg3: VLAN 3, clients vm3
+  $ tarnhost __complete show d | tail -n +2
+  dvs0
+  dvs0:100
+  dvs0:101
   $ tarnhost fault add GetName --message $'bad\xff' && tarnhost show --json | jq -c '.faults'
   [{"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1}]

@@ -40,6 +40,20 @@ std::vector<DVPort> DVPorts(Store::Db& db) {
   return ports;
 }
 
+std::string DVPortName(const DVPort& port) {
+  return port.dvs + ":" + port.portId;
+}
+
+std::optional<DVPort> FindDVPort(Store::Db& db, const std::string& name) {
+  // Port ids may hold a ':', switch names may too: every split is tried.
+  for (auto colon = name.find(':'); colon != std::string::npos; colon = name.find(':', colon + 1)) {
+    for (auto& port : DVPortsOn(db, name.substr(0, colon))) {
+      if (port.portId == name.substr(colon + 1)) return port;
+    }
+  }
+  return std::nullopt;
+}
+
 std::vector<DVPort> DVPortsOn(Store::Db& db, const std::string& dvs) {
   std::vector<DVPort> ports;
   for (auto& port : Store::DVPorts::OnSwitch(db, dvs)) ports.push_back(Read(db, dvs, port));

@@ -39,6 +39,10 @@ void RemoveDVPort(Store::Db& db, const std::string& dvs, const std::string& port
 // Switch, port id, connection id, uplinks, then a field per client.
 std::vector<ListRow> ListDVPorts(Store::Db& db);
 
+// "DVS:PORTID", the name show takes; the DVPort of such a name.
+std::string DVPortName(const DVPort& port);
+std::optional<DVPort> FindDVPort(Store::Db& db, const std::string& name);
+
 std::string DVPortText(const DVPort& port);
 Json DVPortJson(const DVPort& port);
 

@@ -53,8 +53,9 @@ void AddFault(Store::Db& db, const FaultSeed& seed) {
   Model::Check(Model::kFaultTimes, seed.times);
   Store::Transaction transaction(db);
   Store::Faults::Insert(
-      db, {0, seed.operation, seed.on, seed.message.value_or(Store::Faults::kDefaultMessage),
-           seed.detail.value_or(Store::Faults::DefaultDetail(seed.operation)), seed.skip, seed.times});
+      db,
+      {0, seed.operation, seed.on, seed.message.value_or(Store::Faults::kDefaultMessage),
+       seed.detail.value_or(Store::Faults::DefaultDetail(seed.operation)), seed.skip, seed.times});
   transaction.Commit();
 }
 

@@ -105,6 +105,13 @@ std::vector<std::string> Names(Store::Db& db, ObjectKind kind, const std::string
       }
       break;
     }
+    case ObjectKind::kShowable:
+      add(StandardSwitchNames(db));
+      add(Column(ListDVSwitches(db), 0));
+      add(Column(ListOpaqueSwitches(db), 0));
+      add(PortGroupNames(db));
+      for (const auto& port : DVPorts(db)) names.push_back(DVPortName(port));
+      break;
   }
   std::set<std::string> seen;
   std::erase_if(names, [&](const std::string& name) { return !seen.insert(name).second; });

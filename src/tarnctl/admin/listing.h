@@ -37,11 +37,12 @@ enum class ObjectKind {
   kSystemSwitch,
   kDVSwitch,
   kOpaqueSwitch,
-  kPortset,  // standard switch names and the portsets of the others
-  kObject,   // what a fault's --on names: switch, portset, port group or DVPort id
-  kDVPort,   // port ids: of the switch named by the owner, or of any
-  kClient,   // clients: of the port group named by the owner, or of any
-  kFault,    // armed faults' numbers
+  kPortset,   // standard switch names and the portsets of the others
+  kObject,    // what a fault's --on names: switch, portset, port group or DVPort id
+  kShowable,  // what show NAME shows: switch of any kind, port group, DVS:PORTID
+  kDVPort,    // port ids: of the switch named by the owner, or of any
+  kClient,    // clients: of the port group named by the owner, or of any
+  kFault,     // armed faults' numbers
 };
 // The names of `kind` (of `owner`, where the kind says so), each once.
 std::vector<std::string> Names(Store::Db& db, ObjectKind kind, const std::string& owner = "");

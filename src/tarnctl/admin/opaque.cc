@@ -17,6 +17,11 @@ std::vector<OpaqueSwitch> OpaqueSwitches(Store::Db& db) {
   return Store::Opaque::List(db);
 }
 
+std::optional<OpaqueSwitch> FindOpaqueSwitch(Store::Db& db, const std::string& name) {
+  if (auto row = Store::Opaque::Find(db, name)) return OpaqueSwitch{name, std::move(*row)};
+  return std::nullopt;
+}
+
 void AddOpaqueSwitch(Store::Db& db, const OpaqueSeed& seed) {
   Scope scope(db, "AddOpaqueSwitch");
   const std::string portset = seed.portset.value_or(seed.name);

@@ -22,8 +22,9 @@ struct OpaqueSeed {
   std::vector<std::string> uplinks;
 };
 
-// Every opaque switch, in creation order.
+// Every opaque switch, in creation order; the one of a name.
 std::vector<OpaqueSwitch> OpaqueSwitches(Store::Db& db);
+std::optional<OpaqueSwitch> FindOpaqueSwitch(Store::Db& db, const std::string& name);
 
 void AddOpaqueSwitch(Store::Db& db, const OpaqueSeed& seed);
 void RemoveOpaqueSwitch(Store::Db& db, const std::string& name);

@@ -82,6 +82,8 @@ std::optional<Json> Named(Db& db, const std::string& name) {
   }
   add("portGroup",
       InLayers([&](Layer layer) { return FindPortGroup(db, layer, name); }, PortGroupJson));
+  if (auto opaque = FindOpaqueSwitch(db, name)) json["opaqueSwitch"] = OpaqueSwitchJson(*opaque);
+  if (auto port = FindDVPort(db, name)) json["dvport"] = DVPortJson(*port);
   if (json.size() == 1) return std::nullopt;
   return json;
 }
@@ -99,9 +101,7 @@ std::string ShowJson(Store::Db& db, const std::optional<std::string>& name) {
   } else if (auto named = View::Named(db, *name)) {
     json = std::move(*named);
   } else {
-    throw Instrument::Refused(
-        "No standard switch, distributed switch or port group is named " + *name,
-        "in either layer");
+    throw NothingNamed(*name);
   }
   // Names keep the library's name rules, so are UTF-8; should a damaged
   // host hold other bytes, they are replaced rather than fail the output.

@@ -187,12 +187,13 @@ std::string StandardSwitchText(const StandardSwitch& sw) {
                     ", CDP " + Model::CdpWord(sw.row.cdp) + "\n";
   out += "    Uplinks: " + Listed(sw.uplinks) + "\n";
   out += "    " + TeamingText(sw.row.policy) + "\n";
-  for (const auto& group : sw.portGroups) {
-    out += "    Port group " + group.name + ": VLAN " + std::to_string(group.row.vlan) +
-           ", clients " + Listed(group.clients) + "\n";
-    out += "      " + TeamingText(group.row.policy) + "\n";
-  }
+  for (const auto& group : sw.portGroups) out += PortGroupText(group);
   return out;
+}
+
+std::string PortGroupText(const PortGroup& group) {
+  return "    Port group " + group.name + ": VLAN " + std::to_string(group.row.vlan) +
+         ", clients " + Listed(group.clients) + "\n      " + TeamingText(group.row.policy) + "\n";
 }
 
 Json PortGroupJson(const PortGroup& group) {

@@ -52,6 +52,7 @@ std::vector<ListRow> ListClients(Store::Db& db);
 // The lines of `tarnhost show` for a switch and its port groups (link
 // criteria left out).
 std::string StandardSwitchText(const StandardSwitch& sw);
+std::string PortGroupText(const PortGroup& group);
 Json StandardSwitchJson(const StandardSwitch& sw);
 Json PortGroupJson(const PortGroup& group);
 

@@ -18,6 +18,7 @@
 #include "tarnctl/admin/standard.h"
 #include "tarnctl/admin/timeouts.h"
 #include "tarnctl/instrument/call.h"
+#include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/db.h"
 #include "tarnctl/store/reset.h"
 #include "tarnctl/store/transaction.h"
@@ -48,6 +49,11 @@ void Section(std::string& out, const char* title, const Objects& objects, Text t
 }
 
 }  // namespace
+
+Instrument::Refusal NothingNamed(const std::string& name) {
+  return Instrument::Refused("No switch, port group or DVPort is named " + name,
+                             "in either layer (a DVPort is named DVS:PORTID)");
+}
 
 void Init(Store::Db& db, bool empty) {
   Instrument::Scope scope(db, "Init");
@@ -84,6 +90,29 @@ std::string Show(Store::Db& db) {
   Section(out, "DVPorts", DVPorts(db), DVPortText);
   Section(out, "Events", Events(db), [](const std::string& event) { return event; });
   Section(out, "Faults", Faults(db), FaultText);
+  return out;
+}
+
+std::string Show(Store::Db& db, const std::string& name) {
+  Instrument::Scope scope(db, "Show");
+  std::string out;
+  for (const Layer layer : {Layer::kRunning, Layer::kStored}) {
+    std::string part;
+    if (const auto sw = FindStandardSwitch(db, layer, name)) part += StandardSwitchText(*sw);
+    if (const auto group = FindPortGroup(db, layer, name)) {
+      part += "  On standard switch " + group->row.switchName + ":\n" + PortGroupText(*group);
+    }
+    if (const auto dvs = FindDVSwitch(db, layer, name)) part += DVSwitchText(*dvs);
+    if (!part.empty()) {
+      out += layer == Layer::kRunning ? "Running state\n" : "Stored configuration\n";
+      out += part;
+    }
+  }
+  if (const auto opaque = FindOpaqueSwitch(db, name)) {
+    out += "Opaque switch\n  " + OpaqueSwitchText(*opaque) + "\n";
+  }
+  if (const auto port = FindDVPort(db, name)) out += "DVPort\n  " + DVPortText(*port) + "\n";
+  if (out.empty()) throw NothingNamed(name);
   return out;
 }
 

@@ -9,6 +9,8 @@
 #include <optional>
 #include <string>
 
+#include "tarnctl/instrument/errors.h"
+
 namespace TarnCtl::Store {
 class Db;
 }
@@ -23,10 +25,15 @@ void Reboot(Store::Db& db);
 // The whole host as readable text: its file, the running state, the
 // stored configuration, ENS state, timeouts, armed faults.
 std::string Show(Store::Db& db);
-// The whole host as JSON for programs, or with `name` the standard
-// switch, distributed switch and port group of that name in both layers
-// (docs/host.md, "JSON"); refuses a name that is none of them.
+// What is named `name`, as text: the standard switch, distributed switch
+// and port group of that name in each layer, the opaque switch, and the
+// DVPort named "DVS:PORTID"; refuses a name that is none of them.
+std::string Show(Store::Db& db, const std::string& name);
+// The whole host as JSON for programs, or with `name` what Show(db, name)
+// shows (docs/host.md, "JSON").
 std::string ShowJson(Store::Db& db, const std::optional<std::string>& name = std::nullopt);
+// The refusal of a name that show finds nothing of.
+Instrument::Refusal NothingNamed(const std::string& name);
 // The whole host as a Graphviz graph (dot language).
 std::string ShowDot(Store::Db& db);
 
