@@ -40,8 +40,8 @@ std::vector<DVPort> DVPorts(Store::Db& db) {
   return ports;
 }
 
-std::string DVPortName(const DVPort& port) {
-  return port.dvs + ":" + port.portId;
+std::string DVPortName(const std::string& dvs, const std::string& portId) {
+  return dvs + ":" + portId;
 }
 
 std::optional<DVPort> FindDVPort(Store::Db& db, const std::string& name) {

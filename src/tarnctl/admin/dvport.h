@@ -40,7 +40,7 @@ void RemoveDVPort(Store::Db& db, const std::string& dvs, const std::string& port
 std::vector<ListRow> ListDVPorts(Store::Db& db);
 
 // "DVS:PORTID", the name show takes; the DVPort of such a name.
-std::string DVPortName(const DVPort& port);
+std::string DVPortName(const std::string& dvs, const std::string& portId);
 std::optional<DVPort> FindDVPort(Store::Db& db, const std::string& name);
 
 std::string DVPortText(const DVPort& port);

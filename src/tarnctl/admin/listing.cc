@@ -12,22 +12,13 @@
 #include "tarnctl/admin/timeouts.h"
 #include "tarnctl/api/session.h"
 #include "tarnctl/instrument/call.h"
+#include "tarnctl/store/distributed.h"
+#include "tarnctl/store/dvports.h"
+#include "tarnctl/store/opaque.h"
+#include "tarnctl/store/portgroups.h"
+#include "tarnctl/store/standard.h"
 
 namespace TarnCtl::Admin {
-namespace {
-
-// Field `field` of the rows whose first field is `owner` (any, when empty).
-std::vector<std::string> Column(const std::vector<ListRow>& rows, size_t field,
-                                const std::string& owner = "") {
-  std::vector<std::string> values;
-  for (const auto& row : rows) {
-    if (owner.empty() || row[0] == owner) values.push_back(row[field]);
-  }
-  return values;
-}
-
-}  // namespace
-
 std::vector<ListRow> List(Store::Db& db, Listing what) {
   Instrument::Scope scope(db, "List");  // reads whole tables, as Show does
   switch (what) {
@@ -53,9 +44,29 @@ std::vector<ListRow> List(Store::Db& db, Listing what) {
 
 std::vector<std::string> Names(Store::Db& db, ObjectKind kind, const std::string& owner) {
   Instrument::Scope scope(db, "List");
+  using Store::Layer;
   std::vector<std::string> names;
   auto add = [&](const std::vector<std::string>& more) {
     names.insert(names.end(), more.begin(), more.end());
+  };
+  // Names (and portsets) straight from the store, no list rows rendered.
+  auto dvSwitches = [&](bool name, bool portset) {
+    for (const auto& sw : Store::Distributed::List(db, Layer::kRunning)) {
+      if (name) names.push_back(sw.name);
+      if (portset) names.push_back(sw.row.portset);
+    }
+  };
+  auto opaqueSwitches = [&](bool name, bool portset) {
+    for (const auto& sw : Store::Opaque::List(db)) {
+      if (name) names.push_back(sw.name);
+      if (portset) names.push_back(sw.row.portset);
+    }
+  };
+  auto dvPorts = [&](bool qualified) {
+    for (const auto& [dvs, port] : Store::DVPorts::All(db)) {
+      if (owner.empty() || dvs == owner)
+        names.push_back(qualified ? DVPortName(dvs, port.portId) : port.portId);
+    }
   };
   switch (kind) {
     case ObjectKind::kPnic:
@@ -67,50 +78,46 @@ std::vector<std::string> Names(Store::Db& db, ObjectKind kind, const std::string
       }
       break;
     case ObjectKind::kSystemSwitch:
-      add(Column(ListSystemSwitches(db), 0));
+      for (auto& sw : Store::Standard::List(db, Layer::kRunning, true)) names.push_back(sw.name);
       break;
     case ObjectKind::kDVSwitch:
-      add(Column(ListDVSwitches(db), 0));
+      dvSwitches(true, false);
       break;
     case ObjectKind::kOpaqueSwitch:
-      add(Column(ListOpaqueSwitches(db), 0));
+      opaqueSwitches(true, false);
       break;
     case ObjectKind::kClient:
-      add(Column(ListClients(db), 1, owner));
+      for (auto& client : Store::PortGroups::AllClients(db)) {
+        if (owner.empty() || client.portGroup == owner) names.push_back(std::move(client.name));
+      }
       break;
     case ObjectKind::kFault:
-      add(Column(ListFaults(db), 0));
+      for (const auto& fault : Faults(db)) names.push_back(std::to_string(fault.id));
       break;
     case ObjectKind::kDVPort:
-      add(Column(ListDVPorts(db), 1, owner));
+      dvPorts(false);
       break;
     case ObjectKind::kPortGroup:
       add(PortGroupNames(db));
       break;
     case ObjectKind::kSwitch:
     case ObjectKind::kPortset:
-    case ObjectKind::kObject: {
-      const auto dvs = ListDVSwitches(db), opaque = ListOpaqueSwitches(db);
+    case ObjectKind::kObject:
       // A standard switch is its own portset; the others have one each.
       add(StandardSwitchNames(db));
-      if (kind != ObjectKind::kPortset) add(Column(dvs, 0));
-      if (kind != ObjectKind::kSwitch) {
-        add(Column(dvs, 1));
-        add(Column(opaque, 1));
-      }
+      dvSwitches(kind != ObjectKind::kPortset, kind != ObjectKind::kSwitch);
+      opaqueSwitches(kind == ObjectKind::kObject, kind != ObjectKind::kSwitch);
       if (kind == ObjectKind::kObject) {
-        add(Column(opaque, 0));
         add(PortGroupNames(db));
-        add(Column(ListDVPorts(db), 1));
+        dvPorts(false);
       }
       break;
-    }
     case ObjectKind::kShowable:
       add(StandardSwitchNames(db));
-      add(Column(ListDVSwitches(db), 0));
-      add(Column(ListOpaqueSwitches(db), 0));
+      dvSwitches(true, false);
+      opaqueSwitches(true, false);
       add(PortGroupNames(db));
-      for (const auto& port : DVPorts(db)) names.push_back(DVPortName(port));
+      dvPorts(true);
       break;
   }
   std::set<std::string> seen;
