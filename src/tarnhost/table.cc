@@ -372,12 +372,6 @@ size_t KnownPrefix(const Words& words) {
                      known == 0 ? std::vector<const Command*>{} : Select(prefix));
 }
 
-const Command& Resolve(const Words& words, size_t* used) {
-  const Command* command = Find(words, used);
-  if (!command) Explain(words);
-  return *command;
-}
-
 std::vector<const Command*> SelectOrExplain(const Words& prefix) {
   auto selected = Select(prefix);
   if (selected.empty()) Explain(prefix);

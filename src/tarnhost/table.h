@@ -51,8 +51,6 @@ struct CommandError : UsageError {
 
 // Names the word that is missing after `words` or unknown among them.
 [[noreturn]] void Explain(const Words& words);
-// Find(), or Explain() when no command matches.
-const Command& Resolve(const Words& words, size_t* used);
 // Select(), or Explain() when no command matches.
 std::vector<const Command*> SelectOrExplain(const Words& prefix);
 

@@ -73,13 +73,6 @@ class OpaqueState : public DVSwitchState {
 
 }  // namespace
 
-std::unique_ptr<HostCtl::Network::DVSwitch> FindOpaqueSwitch(std::shared_ptr<Session> session,
-                                                             const std::string& name) {
-  auto row = Store::Opaque::Find(session->db(), name);
-  if (!row) return nullptr;
-  return MakeOpaqueSwitch(std::move(session), name, row->portset);
-}
-
 std::unique_ptr<HostCtl::Network::DVSwitch> MakeOpaqueSwitch(std::shared_ptr<Session> session,
                                                              const std::string& name,
                                                              const std::string& portset) {

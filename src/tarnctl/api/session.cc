@@ -16,8 +16,7 @@ namespace {
 
 struct Process {
   std::weak_ptr<Session> session;
-  pid_t owner = 0;                          // a forked child must not use its parent's session
-  std::optional<Store::Location> location;  // set by tests
+  pid_t owner = 0;  // a forked child must not use its parent's session
 };
 
 Process& This() {
@@ -66,12 +65,7 @@ void Session::Commit() {
 }
 
 Store::Location Session::DefaultLocation() {
-  if (This().location) return *This().location;
   return Store::ResolveLocation(Store::ProcessEnvironment());
-}
-
-void Session::UseLocation(std::optional<Store::Location> location) {
-  This().location = std::move(location);
 }
 
 std::shared_ptr<Session> Session::Current() {

@@ -46,9 +46,6 @@ class Session {
   // host it made.
   static std::shared_ptr<Session> Open(const Store::Location& location,
                                        const Store::OpenOptions& options);
-  // Makes Acquire() open `location` instead of the environment's (tests);
-  // nullopt goes back to the environment.
-  static void UseLocation(std::optional<Store::Location> location);
   // Where Acquire() would open the host.
   static Store::Location DefaultLocation();
 

@@ -16,9 +16,6 @@ std::unique_ptr<HostCtl::Network::VirtualSwitch> MakeVirtualSwitch(std::shared_p
 // The running distributed switch `name`; nullptr when there is none.
 std::unique_ptr<HostCtl::Network::DVSwitch> FindDVSwitch(std::shared_ptr<Session> session,
                                                          const std::string& name);
-// The opaque switch `name`; nullptr when there is none.
-std::unique_ptr<HostCtl::Network::DVSwitch> FindOpaqueSwitch(std::shared_ptr<Session> session,
-                                                             const std::string& name);
 // The opaque switch `name` whose portset is `portset`.
 std::unique_ptr<HostCtl::Network::DVSwitch> MakeOpaqueSwitch(std::shared_ptr<Session> session,
                                                              const std::string& name,

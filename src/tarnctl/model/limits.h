@@ -24,7 +24,7 @@ inline constexpr Range kPorts{"Invalid number of ports {}", 8, 4096};
 inline constexpr Range kMtu{"MTU {} is out of range", 1280, 9000};
 // VLAN id of a port group (0: none).
 inline constexpr Range kVlanId{"VLAN id {} is out of range", 0, 4095};
-// CDP status: 0 down, 1 listen, 2 advertise, 3 both (cdp.h).
+// CDP status: 0 down, 1 listen, 2 advertise, 3 both (kCdpWords in words.h).
 inline constexpr Range kCdpStatus{"Invalid CDP status {}", 0, 3};
 // Active uplinks of a teaming policy.
 inline constexpr Range kMaxActive{"Invalid max active uplinks {}", 0, kInt32Max,

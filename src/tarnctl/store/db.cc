@@ -32,7 +32,7 @@ Db::Observer g_observer = nullptr;
 // threaded): SQLite's own mutexes and memory statistics would only cost.
 // The page cache takes its pages one at a time as they are read: by default
 // it sets out room for 20 at the first page, writing into every one of them,
-// and most runs read fewer (20 of the 145 page faults of a -c run).
+// and most runs read fewer (docs/performance.md has the figures).
 // REQUIRES: before the first connection; runs once.
 void ConfigureOnce() {
   static const bool configured = [] {

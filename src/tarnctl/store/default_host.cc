@@ -13,12 +13,12 @@ INSERT INTO meta(key, value) VALUES ('next_seq', '8');
 INSERT INTO pnic(seq, name) VALUES (1, 'pnic0'), (2, 'pnic1'), (3, 'pnic2'), (4, 'pnic3');
 INSERT INTO vswitch(layer, name, seq, num_ports, mtu, cdp, system, policy)
   SELECT layer, 'vswitch0', 5, 128, 1500, 1, 0,
-    '{"flags":16,"balancing":0,"failback":0,"linkCriteria":{"checkMask":0,"minSpeed":0,"errorPercent":0,"fullDuplex":0},"uplinkOrder":["pnic0"],"maxActive":1}'
+    '{"flags":16,"uplinkOrder":["pnic0"],"maxActive":1}'
   FROM (SELECT 0 AS layer UNION ALL SELECT 1);
 INSERT INTO link(layer, pnic, switch, seq) VALUES (0, 'pnic0', 'vswitch0', 6), (1, 'pnic0', 'vswitch0', 6);
 INSERT INTO portgroup(layer, name, switch, seq, vlan, policy)
   SELECT layer, 'Management', 'vswitch0', 7, 0,
-    '{"flags":0,"balancing":0,"failback":0,"linkCriteria":{"checkMask":0,"minSpeed":0,"errorPercent":0,"fullDuplex":0},"uplinkOrder":[],"maxActive":0}'
+    '{}'
   FROM (SELECT 0 AS layer UNION ALL SELECT 1);
 )sql";
 

@@ -402,10 +402,10 @@ std::unique_ptr<Db> Connect(const std::string& real, const std::string& path, He
   try {
     auto db = Db::OpenFile(real, path);
     // Reading the schema finds a file that is damaged past its header. The
-    // first 8 MiB of the file (all of a host of some 60,000 port groups)
-    // are read through a mapping rather than a read() a page: a lookup
-    // costs no system call per level of its tree. Mapped pages count as
-    // resident, so the mapping stays small.
+    // first 8 MiB of the file are read through a mapping rather than a
+    // read() a page: a lookup costs no system call per level of its tree.
+    // Mapped pages count as resident, so the mapping stays small
+    // (docs/performance.md weighs the size).
     db->Exec("PRAGMA mmap_size=8388608");
     db->UseLog(header == Header::kLogged);
     db->Exec("SELECT count(*) FROM sqlite_schema");

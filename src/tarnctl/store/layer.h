@@ -16,9 +16,4 @@ constexpr int64_t LayerValue(Layer layer) {
   return static_cast<int64_t>(layer);
 }
 
-// The layer a `layer` column value names, for rows read back.
-constexpr Layer LayerOf(int64_t value) {
-  return value == 0 ? Layer::kStored : Layer::kRunning;
-}
-
 }  // namespace TarnCtl::Store

@@ -27,8 +27,19 @@ bool EnsNodeSet(Db& db) {
 }
 
 void SetEnsNode(Db& db, uint32_t value) {
-  db.Prepare("INSERT OR REPLACE INTO meta(key, value) VALUES ('ens_node', ?)")
-      .Bind(1, std::to_string(value))
+  SetValue(db, "ens_node", std::to_string(value));
+}
+
+std::optional<std::string> Value(Db& db, const std::string& key) {
+  auto select = db.Prepare("SELECT value FROM meta WHERE key = ?");
+  if (!select.Bind(1, key).Step()) return std::nullopt;
+  return select.Text(0);
+}
+
+void SetValue(Db& db, const std::string& key, const std::string& value) {
+  db.Prepare("INSERT OR REPLACE INTO meta(key, value) VALUES (?, ?)")
+      .Bind(1, key)
+      .Bind(2, value)
       .Run();
 }
 

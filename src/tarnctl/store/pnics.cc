@@ -39,13 +39,4 @@ std::optional<std::string> OpaqueHolder(Db& db, const std::string& pnic) {
   return holder.Text(0);
 }
 
-bool StoredUse(Db& db, const std::string& pnic) {
-  return db
-      .Prepare(
-          "SELECT 1 FROM link WHERE layer = 0 AND pnic = ?1"
-          " UNION ALL SELECT 1 FROM dvs_uplink WHERE layer = 0 AND pnic = ?1")
-      .Bind(1, pnic)
-      .Step();
-}
-
 }  // namespace TarnCtl::Store::Pnics

@@ -25,8 +25,5 @@ std::vector<std::string> Names(Db& db);
 std::optional<std::string> LinkedSwitch(Db& db, Layer layer, const std::string& pnic);
 // The opaque switch that holds `pnic` among its uplinks.
 std::optional<std::string> OpaqueHolder(Db& db, const std::string& pnic);
-// Whether a stored link, cached distributed uplink or stored timeout names
-// `pnic` (what may still want it back after a restore).
-bool StoredUse(Db& db, const std::string& pnic);
 
 }  // namespace TarnCtl::Store::Pnics

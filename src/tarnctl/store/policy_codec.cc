@@ -1,8 +1,6 @@
 #include "tarnctl/store/policy_codec.h"
 
-#include <algorithm>
 #include <limits>
-#include <type_traits>
 
 #include "hostctl/exception.h"
 #include "tarnctl/store/teaming_fields.h"
@@ -38,72 +36,50 @@ class Writer {
   PolicyForm form_;
 };
 
-class Reader {
+// A value of the JSON library, as ReadTeamingPolicy reads it.
+class JsonNode {
  public:
-  Reader(const Json& object, PolicyForm form, std::string where)
-      : object_(object), form_(form), where_(std::move(where)) {
-    if (!object_.is_object()) throw FormatError(where_ + "must be an object");
-  }
+  JsonNode() = default;
+  explicit JsonNode(const Json& json) : json_(&json) {}
 
-  template <typename T>
-  void Number(const char* key, T& value) {
-    const Json* field = Find(key);
-    value = 0;
-    if (field == nullptr) return;
-    bool fits = false;
-    if (field->is_number_unsigned()) {
-      fits = field->get<uint64_t>() <= static_cast<uint64_t>(std::numeric_limits<T>::max());
-    } else if (field->is_number_integer()) {
-      fits = field->get<int64_t>() >= static_cast<int64_t>(std::numeric_limits<T>::min());
-    }
-    if (!fits) {
-      throw FormatError(where_ + key + " must be an integer from " +
-                        std::to_string(std::numeric_limits<T>::min()) + " to " +
-                        std::to_string(std::numeric_limits<T>::max()));
-    }
-    value = field->get<T>();
+  bool Object(size_t& fields) const {
+    fields = json_ != nullptr ? json_->size() : 0;
+    return json_ == nullptr || json_->is_object();
   }
-  void Names(const char* key, std::vector<std::string>& names) {
-    const Json* field = Find(key);
-    names.clear();
-    if (field == nullptr) return;
+  bool Field(const char* key, JsonNode& field) const {
+    if (json_ == nullptr) return false;
+    const auto found = json_->find(key);
+    if (found == json_->end()) return false;
+    field = JsonNode(*found);
+    return true;
+  }
+  bool Int64(int64_t& number) const {
+    if (json_->is_number_unsigned()) {
+      const auto value = json_->get<uint64_t>();
+      number = static_cast<int64_t>(value);
+      return value <= static_cast<uint64_t>(std::numeric_limits<int64_t>::max());
+    }
+    if (!json_->is_number_integer()) return false;
+    number = json_->get<int64_t>();
+    return true;
+  }
+  bool Uint64(uint64_t& number) const {
+    if (!json_->is_number_unsigned()) return false;
+    number = json_->get<uint64_t>();
+    return true;
+  }
+  bool Names(std::vector<std::string>& names) const {
     try {
-      names = NamesFromJson(*field);
-    } catch (const FormatError& e) {
-      throw FormatError(where_ + key + " " + e.what());
+      names = NamesFromJson(*json_);
+      return true;
+    } catch (const FormatError&) {
+      return false;
     }
   }
-  template <typename Inside>
-  void Group(const char* key, Inside inside) {
-    static const Json kEmpty = Json::object();
-    const Json* field = Find(key);
-    Reader reader(field != nullptr ? *field : kEmpty, form_, where_ + key + ".");
-    inside(reader);
-    reader.RefuseUnknownKeys();
-  }
-
-  void RefuseUnknownKeys() {
-    if (form_ != PolicyForm::kFull) return;
-    for (const auto& item : object_.items()) {
-      if (std::find(seen_.begin(), seen_.end(), item.key()) == seen_.end()) {
-        throw FormatError(where_ + item.key() + " is not a field");
-      }
-    }
-  }
+  [[noreturn]] void Fail(const std::string& why) const { throw FormatError(why); }
 
  private:
-  const Json* Find(const char* key) {
-    seen_.push_back(key);
-    const auto found = object_.find(key);
-    if (found != object_.end()) return &*found;
-    if (form_ == PolicyForm::kFull) throw FormatError(where_ + key + " is missing");
-    return nullptr;
-  }
-
-  const Json& object_;
-  PolicyForm form_;
-  std::string where_;
-  std::vector<std::string_view> seen_;  // keys are literals
+  const Json* json_ = nullptr;  // nullptr: an empty object
 };
 
 [[noreturn]] void Malformed(const std::string& what, const std::string& text) {
@@ -137,11 +113,7 @@ Json PolicyToJson(const NicTeamingPolicy& policy, PolicyForm form) {
 }
 
 NicTeamingPolicy PolicyFromJson(const Json& json, PolicyForm form) {
-  NicTeamingPolicy policy;
-  Reader reader(json, form, "");
-  VisitTeamingFields(policy, reader);
-  reader.RefuseUnknownKeys();
-  return policy;
+  return ReadTeamingPolicy(JsonNode(json), form);
 }
 
 std::string EncodeTeamingPolicy(const NicTeamingPolicy& policy) {

@@ -14,6 +14,7 @@
 #include <vector>
 
 #include "hostctl/records.h"
+#include "tarnctl/store/teaming_fields.h"
 
 namespace TarnCtl::Store {
 
@@ -23,11 +24,6 @@ using Json = nlohmann::ordered_json;
 // says what is wrong, naming the field.
 struct FormatError : std::runtime_error {
   using std::runtime_error::runtime_error;
-};
-
-enum class PolicyForm {
-  kStored,  // zero fields left out; unknown keys ignored when reading
-  kFull,    // every field present; unknown keys refused when reading
 };
 
 Json PolicyToJson(const HostCtl::Network::NicTeamingPolicy& policy, PolicyForm form);

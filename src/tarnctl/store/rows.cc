@@ -17,10 +17,11 @@ int64_t Single(Db& db, const std::string& sql) {
   return select.Step() ? select.Int(0) : 0;
 }
 
-std::string InsertSql(const char* conflict, const Shape& shape) {
+// A row whose key is there already is left out.
+std::string InsertSql(const Shape& shape) {
   std::string marks;
   for (size_t i = 1; i <= shape.columns.size(); ++i) marks += (i > 1 ? ", ?" : "?");
-  return "INSERT OR " + std::string(conflict) + " INTO " + shape.table + "(" + ColumnList(shape) +
+  return "INSERT OR IGNORE INTO " + std::string(shape.table) + "(" + ColumnList(shape) +
          ") VALUES (" + marks + ")";
 }
 
@@ -62,15 +63,7 @@ void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector
   }
 }
 
-bool Insert(Db& db, const Shape& shape, const std::vector<Value>& values) {
-  return InsertValues(db, InsertSql("IGNORE", shape), values);
-}
-
-void Replace(Db& db, const Shape& shape, const std::vector<Value>& values) {
-  InsertValues(db, InsertSql("REPLACE", shape), values);
-}
-
-Inserter::Inserter(Db& db, const Shape& shape) : db_(db), sql_(InsertSql("IGNORE", shape)) {}
+Inserter::Inserter(Db& db, const Shape& shape) : db_(db), sql_(InsertSql(shape)) {}
 
 bool Inserter::Insert(const std::vector<Value>& values) {
   return InsertValues(db_, sql_, values);

@@ -25,8 +25,6 @@ struct Shape {
 
 // Calls `each` with every row's values, in the shape's order.
 void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector<Value>&)>& each);
-// Inserts a row; false when a row with its key is there already.
-bool Insert(Db& db, const Shape& shape, const std::vector<Value>& values);
 
 // Inserts rows of one shape one after the other, the statement prepared
 // once (a load inserts many).
@@ -40,8 +38,6 @@ class Inserter {
   Db& db_;
   std::string sql_;
 };
-// Inserts a row in place of the one with its key.
-void Replace(Db& db, const Shape& shape, const std::vector<Value>& values);
 void Clear(Db& db, const Shape& shape);
 // Turns every negative value -k of `column` into base + k: placeholders
 // for values that are assigned once all rows are in.

@@ -320,6 +320,8 @@ TEST_F(AdminTest, LoadRefusesWhatTheLibraryWouldNeverMake) {
       {"policy incomplete", with(sys0 + "/policy/maxActive", {}),
        "field \"policy\": maxActive is missing"},
       {"policy negative", with(sys0 + "/policy/maxActive", -5), "Invalid max active uplinks -5"},
+      {"policy out of range", with(sys0 + "/policy/linkCriteria/fullDuplex", 256),
+       "field \"policy\": linkCriteria.fullDuplex must be an integer from 0 to 255"},
       {"policy repeats a pnic", with(sys0 + "/policy/uplinkOrder", Json::array({"pnic4", "pnic4"})),
        "Uplink pnic4 appears twice in the teaming order"},
       {"duplicate row", with(at("pnic", "pnic5") + "/name", "pnic4"),

@@ -31,6 +31,10 @@ void CheckEventKind(const std::string& kind) {
   if (kind != "nota") throw Instrument::Refused("Unknown DVPort event " + kind, "(nota)");
 }
 
+void CheckUsedPorts(const Fields& row) {
+  Model::Check(Model::kUsedPorts, row.Int("used_ports"), row.Int("num_ports"));
+}
+
 void CheckOperation(const std::string& name) {
   if (Instrument::FindOperation(name) == nullptr) {
     throw Instrument::Refused("Unknown operation " + name);
@@ -119,7 +123,8 @@ const std::vector<Table>& Tables() {
        {Name("name", NameKind::kSwitch), Name("portset", NameKind::kPortset),
         Int("num_ports", Model::kPorts), Int("used_ports", Model::kUsedPorts),
         Of("uplinks", Kind::kNames), Seq()},
-       "seq"},
+       "seq",
+       {{"used_ports", CheckUsedPorts}}},
       {"ens", "portset", {Name("portset", NameKind::kPortset), Flag("intr"), Flag("fast_switch")}},
       {"ens_event",
        "seq",
@@ -156,8 +161,14 @@ const Table* FindTable(const std::string& name) {
   return nullptr;
 }
 
-const Table& TableNamed(const char* name) {
-  return *FindTable(name);
+bool Table::CountsSeq() const {
+  return counter != nullptr && std::strcmp(counter, "seq") == 0;
+}
+
+int64_t Fields::Int(const char* column) const {
+  size_t i = 0;
+  while (i < table_.columns.size() && std::strcmp(table_.columns[i].name, column) != 0) ++i;
+  return std::get<int64_t>(values_.at(i));  // a column the table has
 }
 
 }  // namespace TarnCtl::Admin::Dump

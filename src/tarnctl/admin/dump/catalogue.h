@@ -33,6 +33,27 @@ struct Column {
   TextRule rule = nullptr;                   // kText
 };
 
+struct Table;
+
+// A row's values, by column name.
+class Fields {
+ public:
+  Fields(const Table& table, const std::vector<Store::Rows::Value>& values)
+      : table_(table), values_(values) {}
+  int64_t Int(const char* column) const;
+
+ private:
+  const Table& table_;
+  const std::vector<Store::Rows::Value>& values_;
+};
+
+// A rule between the fields of one row. It refuses as the model's rules
+// do, and the refusal names `field`.
+struct RowRule {
+  const char* field;
+  void (*check)(const Fields& row);
+};
+
 struct Table {
   const char* name;
   const char* order;  // the rows' order in a dump, as column names
@@ -40,14 +61,16 @@ struct Table {
   // The column that draws from the ordering counter ("seq"), or the
   // fault's "id": assigned in file order when a row leaves it out.
   const char* counter = nullptr;
+  std::vector<RowRule> rules = {};
 
   Store::Rows::Shape Shape() const;
+  // Whether `counter` draws from the ordering counter (the host's next_seq).
+  bool CountsSeq() const;
 };
 
 // Every table, in dump order.
 const std::vector<Table>& Tables();
 const Table* FindTable(const std::string& name);
-const Table& TableNamed(const char* name);
 
 inline constexpr const char* kFormat = "tarnhost-dump";
 inline constexpr int64_t kVersion = 1;

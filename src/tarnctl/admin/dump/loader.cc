@@ -3,22 +3,20 @@
 // The document is read in one pass (simdjson's on-demand parser: the
 // structure and the scalars are read where they stand) and each row is
 // inserted as soon as it is read, so a large host is never held twice. A
-// row's teaming policy is read by visiting its fields, as every reader and
-// writer of a policy does. Keys may
-// come in any order, tables may be left out (they are empty), and a row may
-// leave out its "seq" (or a fault its "id"): those are assigned in file
-// order after every row is in, and meta's "next_seq" and "ens_node" are
-// inferred when absent. Every value is held to the rule the library applies
-// to it, and the whole host to the library's invariants; the first fault
-// found is refused naming its table, row and field, and the host is left
-// as it was (the load is one transaction).
+// row's teaming policy is read by the store's policy reader, over this
+// parser. Keys may come in any order, tables may be left out (they are
+// empty), and a row may leave out its "seq" (or a fault its "id"): those
+// are assigned in file order after every row is in, and meta's "next_seq"
+// and "ens_node" are inferred when absent. Every value is held to the rule
+// the library applies to it (the catalogue names each, and the rules
+// between a row's fields), and the whole host to the library's invariants;
+// the first fault found is refused naming its table, row and field, and
+// the host is left as it was (the load is one transaction).
 #include <algorithm>
-#include <limits>
 #include <map>
 #include <optional>
 #include <set>
 #include <string>
-#include <type_traits>
 #include <vector>
 
 #include <simdjson.h>
@@ -31,6 +29,7 @@
 #include "tarnctl/model/invariants.h"
 #include "tarnctl/model/names.h"
 #include "tarnctl/model/teaming.h"
+#include "tarnctl/store/meta.h"
 #include "tarnctl/store/policy_codec.h"
 #include "tarnctl/store/teaming_fields.h"
 #include "tarnctl/store/transaction.h"
@@ -184,19 +183,24 @@ class Loader {
     }
   }
 
-  [[noreturn]] void BadField(const Column& c, const std::string& why) {
+  [[noreturn]] void BadField(const char* field, const std::string& why) {
     Bad("table " + Quote(table_->name) + ", row " + std::to_string(rowNumber_) + ", field " +
-        Quote(c.name) + ": " + why);
+        Quote(field) + ": " + why);
   }
+  [[noreturn]] void BadField(const Column& c, const std::string& why) { BadField(c.name, why); }
 
   // Runs a model rule on a field's value, naming the field when it refuses.
   template <typename Rule>
-  void Apply(const Column& c, Rule rule) {
+  void Apply(const char* field, Rule rule) {
     try {
       rule();
     } catch (const HostCtlException& refusal) {
-      BadField(c, Reason(refusal));
+      BadField(field, Reason(refusal));
     }
+  }
+  template <typename Rule>
+  void Apply(const Column& c, Rule rule) {
+    Apply(c.name, rule);
   }
 
   // A text field: a string, or {"hex": "<bytes in hex>"}.
@@ -233,74 +237,41 @@ class Loader {
     return names;
   }
 
-  // Reads a teaming policy in its full form (every field, nothing else),
-  // visiting its fields as every reader and writer of a policy does.
-  class PolicyReader {
+  // A value of the document as Store::ReadTeamingPolicy reads it; its
+  // refusals name the row's field.
+  class PolicyNode {
    public:
-    PolicyReader(Loader& loader, const Column& c, ondemand::value& v, std::string where)
-        : loader_(loader), column_(c), where_(std::move(where)) {
-      if (v.get_object().get(object_) || object_.count_fields().get(fields_)) {
-        Fail("must be an object");
-      }
-    }
+    PolicyNode() = default;
+    PolicyNode(Loader& loader, const Column& c, ondemand::value value)
+        : loader_(&loader), column_(&c), value_(value) {}
 
-    template <typename T>
-    void Number(const char* key, T& value) {
-      ondemand::value field = Find(key);
-      bool fits = false;
-      if constexpr (std::is_signed_v<T>) {
-        int64_t number = 0;
-        fits = !field.get_int64().get(number) && number >= std::numeric_limits<T>::min() &&
-               number <= std::numeric_limits<T>::max();
-        value = static_cast<T>(number);
-      } else {
-        uint64_t number = 0;
-        fits = !field.get_uint64().get(number) && number <= std::numeric_limits<T>::max();
-        value = static_cast<T>(number);
-      }
-      if (!fits) {
-        Fail(std::string(key) + " must be an integer from " +
-             std::to_string(std::numeric_limits<T>::min()) + " to " +
-             std::to_string(std::numeric_limits<T>::max()));
-      }
+    bool Object(size_t& fields) {
+      return !value_.get_object().get(object_) && !object_.count_fields().get(fields);
     }
-    void Names(const char* key, std::vector<std::string>& names) {
-      ondemand::value field = Find(key);
+    bool Field(const char* key, PolicyNode& field) {
+      ondemand::value value;
+      if (object_.find_field_unordered(key).get(value)) return false;
+      field = PolicyNode(*loader_, *column_, value);
+      return true;
+    }
+    bool Int64(int64_t& number) { return !value_.get_int64().get(number); }
+    bool Uint64(uint64_t& number) { return !value_.get_uint64().get(number); }
+    bool Names(std::vector<std::string>& names) {
       ondemand::array array;
-      if (field.get_array().get(array)) Fail(std::string(key) + " must be an array of names");
-      names.clear();
+      if (value_.get_array().get(array)) return false;
       for (auto element : array) {
         ondemand::value name = Must<ondemand::value>(std::move(element));
-        names.push_back(loader_.TextField(column_, name));
+        names.push_back(loader_->TextField(*column_, name));
       }
+      return true;
     }
-    template <typename Inside>
-    void Group(const char* key, Inside inside) {
-      ondemand::value field = Find(key);
-      PolicyReader reader(loader_, column_, field, where_ + key + ".");
-      inside(reader);
-      reader.RefuseOthers();
-    }
-    // After the visit: the object holds no field that was not asked for.
-    void RefuseOthers() {
-      if (fields_ != asked_) Fail("holds a key that is not a field, or one twice");
-    }
+    [[noreturn]] void Fail(const std::string& why) { loader_->BadField(*column_, why); }
 
    private:
-    ondemand::value Find(const char* key) {
-      ++asked_;
-      ondemand::value field;
-      if (object_.find_field_unordered(key).get(field)) Fail(std::string(key) + " is missing");
-      return field;
-    }
-    [[noreturn]] void Fail(const std::string& why) { loader_.BadField(column_, where_ + why); }
-
-    Loader& loader_;
-    const Column& column_;
-    std::string where_;
+    Loader* loader_ = nullptr;
+    const Column* column_ = nullptr;
+    ondemand::value value_;
     ondemand::object object_;
-    size_t fields_ = 0;
-    size_t asked_ = 0;
   };
 
   Value ValueOf(const Column& c, ondemand::value& v) {
@@ -345,10 +316,8 @@ class Loader {
     const simdjson::padded_string text(raw);
     auto document = Must<ondemand::document>(policyParser_.iterate(text));
     auto value = Must<ondemand::value>(document.get_value());
-    HostCtl::Network::NicTeamingPolicy policy;
-    PolicyReader reader(*this, c, value, "");
-    Store::VisitTeamingFields(policy, reader);
-    reader.RefuseOthers();
+    const auto policy =
+        Store::ReadTeamingPolicy(PolicyNode(*this, c, value), Store::PolicyForm::kFull);
     Apply(c, [&] { Model::CheckTeamingPolicy(policy); });
     return Store::EncodeTeamingPolicy(policy);
   }
@@ -383,23 +352,14 @@ class Loader {
       values[i] = -++placeholders_;  // a placeholder, assigned in Finish()
       counter->lastPlaceholder = placeholders_;
     }
-    CheckRow(t, values);
+    for (const Dump::RowRule& rule : t.rules) {
+      Apply(rule.field, [&] { rule.check(Dump::Fields(t, values)); });
+    }
     if (!inserter.Insert(values)) {
       Bad("table " + Quote(t.name) + ", row " + std::to_string(rowNumber_) +
           ": repeats the key of an earlier row");
     }
     if (progress_ && ++rows_ % 4096 == 0) progress_(rows_, 0);
-  }
-
-  // Rules between the fields of one row.
-  void CheckRow(const Table& t, const std::vector<Value>& values) {
-    if (std::string(t.name) == "opaque") {
-      const int64_t ports = std::get<int64_t>(values[2]);
-      Apply(t.columns[3],
-            [&] { Model::Check(Model::kUsedPorts, std::get<int64_t>(values[3]), ports); });
-    } else if (std::string(t.name) == "meta") {
-      meta_[std::get<std::string>(values[0])] = std::get<std::string>(values[1]);
-    }
   }
 
   // Counters left out: seq values go after the largest given one (and
@@ -409,7 +369,7 @@ class Loader {
     const auto next = NextSeqGiven();
     int64_t given = 0;
     for (const Table& t : Dump::Tables()) {
-      if (IsSeq(t)) given = std::max(given, counters_[&t].given);
+      if (t.CountsSeq()) given = std::max(given, counters_[&t].given);
     }
     if (next && *next <= given) {
       Bad("meta key \"next_seq\" (" + std::to_string(*next) + ") is not beyond the largest seq (" +
@@ -420,31 +380,26 @@ class Loader {
     for (const Table& t : Dump::Tables()) {
       if (t.counter == nullptr) continue;
       const Counter& counter = counters_[&t];
-      const int64_t from = IsSeq(t) ? base : counter.given;
+      const int64_t from = t.CountsSeq() ? base : counter.given;
       int64_t largest = counter.given;
       if (counter.lastPlaceholder > 0) {
         Store::Rows::AssignPlaceholders(db_, t.Shape(), t.counter, from);
         largest = std::max(largest, from + counter.lastPlaceholder);
       }
-      if (IsSeq(t)) maxSeq = std::max(maxSeq, largest);
+      if (t.CountsSeq()) maxSeq = std::max(maxSeq, largest);
     }
     if (!Model::Within(Model::kSeq, maxSeq + 1)) {
       Bad("the largest seq (" + std::to_string(maxSeq) + ") leaves no room for the counter");
     }
     const int64_t counter = next ? std::max(*next, maxSeq + 1) : maxSeq + 1;
-    Store::Rows::Replace(db_, Dump::TableNamed("meta").Shape(),
-                         {std::string(Dump::kNextSeqKey), std::to_string(counter)});
-  }
-
-  static bool IsSeq(const Table& t) {
-    return t.counter != nullptr && std::string(t.counter) == "seq";
+    Store::Meta::SetValue(db_, Dump::kNextSeqKey, std::to_string(counter));
   }
 
   // The next_seq the document gives, checked; nothing when it gives none.
   std::optional<int64_t> NextSeqGiven() {
-    const auto next = meta_.find(Dump::kNextSeqKey);
-    if (next == meta_.end()) return std::nullopt;
-    const std::string& text = next->second;
+    const auto next = Store::Meta::Value(db_, Dump::kNextSeqKey);
+    if (!next) return std::nullopt;
+    const std::string& text = *next;
     size_t used = 0;
     int64_t value = 0;
     try {
@@ -460,12 +415,11 @@ class Loader {
   }
 
   void FinishMeta() {
-    const auto ens = meta_.find(Dump::kEnsNodeKey);
-    if (ens == meta_.end()) {
-      Store::Rows::Insert(db_, Dump::TableNamed("meta").Shape(),
-                          {std::string(Dump::kEnsNodeKey), std::string("0")});
-    } else if (ens->second != "0" && ens->second != "1") {
-      Bad("meta key \"ens_node\" must be \"0\" or \"1\", not " + Quote(ens->second));
+    const auto ens = Store::Meta::Value(db_, Dump::kEnsNodeKey);
+    if (!ens) {
+      Store::Meta::SetValue(db_, Dump::kEnsNodeKey, "0");
+    } else if (*ens != "0" && *ens != "1") {
+      Bad("meta key \"ens_node\" must be \"0\" or \"1\", not " + Quote(*ens));
     }
   }
 
@@ -484,7 +438,6 @@ class Loader {
     int64_t lastPlaceholder = 0;
   };
   std::map<const Table*, Counter> counters_;
-  std::map<std::string, std::string> meta_;
   std::map<std::string, Store::Rows::Inserter> inserters_;
   ondemand::parser policyParser_;
   std::map<std::string, std::string, std::less<>> policies_;  // JSON text, stored form

@@ -9,8 +9,9 @@
 // appear as objects with every field, opaque uplinks as arrays. A text that
 // is not valid UTF-8 appears as {"hex": "<bytes in hex>"}.
 //
-// The host is not held twice: each row is made a JSON value and written
-// into the text at once.
+// The host is not held twice: each row is written into the text as it is
+// read.
+#include <algorithm>
 #include <string>
 #include <unordered_map>
 
@@ -18,6 +19,7 @@
 #include "tarnctl/admin/text_json.h"
 #include "tarnctl/admin/whole_host.h"
 #include "tarnctl/instrument/call.h"
+#include "tarnctl/model/names.h"
 #include "tarnctl/store/policy_codec.h"
 
 namespace TarnCtl::Admin {
@@ -28,46 +30,101 @@ using Dump::Kind;
 using Json = Store::Json;
 
 constexpr int kIndent = 2;
-// Rows stand at depth 3 of the document.
+// Rows stand at depth 3 of the document, their fields at depth 4.
 constexpr int kRowDepth = 3;
+constexpr int kFieldDepth = kRowDepth + 1;
 
-// The JSON of each stored policy text met so far: most rows share a few.
+void Indent(std::string& out, int depth) {
+  out.append(static_cast<size_t>(kIndent * depth), ' ');
+}
+
+// Appends `json` as it stands at `depth` of the document: the JSON
+// library's text of it, each line moved in by the depth. (Its lines break
+// only between tokens: a newline in a string is written \n.)
+void Append(std::string& out, const Json& json, int depth) {
+  const std::string text = json.dump(kIndent);
+  size_t from = 0;
+  for (size_t end = text.find('\n'); end != std::string::npos; end = text.find('\n', from)) {
+    out.append(text, from, end + 1 - from);
+    Indent(out, depth);
+    from = end + 1;
+  }
+  out.append(text, from);
+}
+
+// Appends a text as TextJson makes it. Most texts are names with nothing
+// to escape: those are written as they stand, without a JSON value.
+void AppendText(std::string& out, const std::string& text, int depth) {
+  const bool plain = std::none_of(text.begin(), text.end(), [](char c) {
+    return static_cast<unsigned char>(c) < 0x20 || c == '"' || c == '\\';
+  });
+  if (plain && Model::IsUtf8(text)) {
+    out += '"';
+    out += text;
+    out += '"';
+  } else {
+    Append(out, TextJson(text), depth);
+  }
+}
+
+// The text of each stored policy met so far, as it stands in a row: most
+// rows share a few.
 class Policies {
  public:
-  const Json& Of(const std::string& stored) {
+  const std::string& Of(const std::string& stored) {
     auto found = known_.find(stored);
-    if (found == known_.end()) found = known_.emplace(stored, PolicyJson(stored)).first;
+    if (found == known_.end()) {
+      std::string text;
+      Append(text, PolicyJson(stored), kFieldDepth);
+      found = known_.emplace(stored, std::move(text)).first;
+    }
     return found->second;
   }
 
  private:
-  std::unordered_map<std::string, Json> known_;
+  std::unordered_map<std::string, std::string> known_;
 };
 
-Json ValueJson(const Dump::Column& column, const Store::Rows::Value& value, Policies& policies) {
+void AppendValue(std::string& out, const Dump::Column& column, const Store::Rows::Value& value,
+                 Policies& policies) {
   switch (column.kind) {
     case Kind::kInt:
-      return std::get<int64_t>(value);
+      out += std::to_string(std::get<int64_t>(value));
+      return;
     case Kind::kOptText:
-      if (std::holds_alternative<std::monostate>(value)) return nullptr;
+      if (std::holds_alternative<std::monostate>(value)) {
+        out += "null";
+        return;
+      }
       [[fallthrough]];
     case Kind::kText:
-      return TextJson(std::get<std::string>(value));
+      AppendText(out, std::get<std::string>(value), kFieldDepth);
+      return;
     case Kind::kPolicy:
-      return policies.Of(std::get<std::string>(value));
+      out += policies.Of(std::get<std::string>(value));
+      return;
     case Kind::kNames:
-      return NamesJson(Store::DecodeNameList(std::get<std::string>(value)));
+      Append(out, NamesJson(Store::DecodeNameList(std::get<std::string>(value))), kFieldDepth);
+      return;
   }
-  return nullptr;
 }
 
-// Appends `json` as it stands at `depth` of the document: the JSON
-// library's own pretty printer, told where it starts.
-void Append(std::string& out, const Json& json, int depth) {
-  nlohmann::detail::serializer<Json> printer(
-      nlohmann::detail::output_adapter<char, std::string>(out), ' ',
-      nlohmann::detail::error_handler_t::strict);
-  printer.dump(json, true, false, kIndent, kIndent * depth);
+// A row as the JSON library writes an object of its fields, in column
+// order; the names of columns need no escape.
+void AppendRow(std::string& out, const Dump::Table& table,
+               const std::vector<Store::Rows::Value>& values, Policies& policies) {
+  out += '{';
+  for (size_t i = 0; i < values.size(); ++i) {
+    out += i == 0 ? "\n" : ",\n";
+    Indent(out, kFieldDepth);
+    out += '"';
+    out += table.columns[i].name;
+    out += "\": ";
+    AppendValue(out, table.columns[i], values[i], policies);
+  }
+  out += '\n';
+  Indent(out, kRowDepth);
+  out += '}';
 }
 
 }  // namespace
@@ -80,23 +137,19 @@ std::string DumpHost(Store::Db& db, const Progress& progress) {
   Policies policies;
 
   std::string out = "{\n  \"format\": ";
-  Append(out, Dump::kFormat, 1);
+  AppendText(out, Dump::kFormat, 1);
   out += ",\n  \"version\": " + std::to_string(Dump::kVersion) + ",\n  \"tables\": {";
   bool firstTable = true;
   for (const auto& table : Dump::Tables()) {
     out += firstTable ? "\n    " : ",\n    ";
     firstTable = false;
-    Append(out, table.name, 2);
+    AppendText(out, table.name, 2);
     out += ": [";
     bool firstRow = true;
-    Json row = Json::object();
     Store::Rows::Scan(db, table.Shape(), [&](const std::vector<Store::Rows::Value>& values) {
-      for (size_t i = 0; i < values.size(); ++i) {
-        row[table.columns[i].name] = ValueJson(table.columns[i], values[i], policies);
-      }
       out += firstRow ? "\n      " : ",\n      ";
       firstRow = false;
-      Append(out, row, kRowDepth);
+      AppendRow(out, table, values, policies);
       if (progress && ++done % 4096 == 0) progress(done, total);
     });
     if (!firstRow) out += "\n    ";
