@@ -37,8 +37,9 @@ enum class Kind {
   DVPort,  // a DVPort id of the switch named before it
   OpaqueSwitch,
   Portset,
-  Object,  // any named object: switch, portset, port group, DVPort id
-  Fault,   // the number of an armed fault
+  Object,    // any named object: switch, portset, port group, DVPort id
+  Fault,     // the number of an armed fault
+  Snapshot,  // the name of a snapshot of the host
 };
 
 struct OptionDef {
@@ -63,6 +64,9 @@ struct Syntax {
   std::vector<ArgumentDef> arguments = {};
   std::vector<OptionDef> options = {};
   bool raw = false;  // every word is an argument: no options, no --help
+  // The arguments are the words after "--", taken as they are (a command
+  // line); the options come before it.
+  bool rest = false;
 
   const OptionDef* Option(const std::string& name) const;
   // The arguments and options as usage text shows them.
