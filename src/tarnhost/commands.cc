@@ -283,16 +283,18 @@ int Diff(const Args& args) {
   if (layers && !given.empty()) throw UsageError("--layers compares the host's own layers");
   if (!layers && given.empty()) throw UsageError("missing A");
   try {
-    // The host's lock keeps its snapshots as they are while they are read.
-    Admin::Host host;
+    // The host is opened only to be compared: a snapshot, replaced by a
+    // rename, stays as it was opened, and `tarnhost dump | tarnhost diff
+    // A -` must not wait for the host's lock.
     std::vector<Admin::Difference> differences;
     if (layers) {
-      differences = Admin::DiffLayers(host.db());
-    } else {
+      differences = Admin::DiffLayers(Admin::Host().db());
+    } else if (given.size() == 1) {
       State from(given[0]);
-      std::optional<State> to;
-      if (given.size() > 1) to.emplace(given[1]);
-      differences = Admin::DiffHosts(from.db(), to ? to->db() : host.db());
+      differences = Admin::DiffHosts(from.db(), Admin::Host().db());
+    } else {
+      State from(given[0]), to(given[1]);
+      differences = Admin::DiffHosts(from.db(), to.db());
     }
     Print(DiffOutput(differences, args.Has("json")));
     return differences.empty() ? 0 : 1;

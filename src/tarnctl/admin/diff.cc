@@ -175,7 +175,7 @@ void DiffLayered(Db& a, Layer layerA, Db& b, Layer layerB, std::optional<Layer> 
 }  // namespace
 
 std::vector<Difference> DiffHosts(Db& from, Db& to) {
-  Instrument::Scope scope(from, "Diff");
+  Instrument::Scope scopeFrom(from, "Diff"), scopeTo(to, "Diff");
   std::vector<Difference> out;
   {
     Collector collect(out, "pnic", std::nullopt);

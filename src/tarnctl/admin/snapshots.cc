@@ -91,6 +91,7 @@ void RestoreSnapshot(Store::Db& db, const std::string& hostPath, const std::stri
   Instrument::Scope scope(db, "Restore");
   std::vector<std::string> tables;
   for (const auto& table : Dump::Tables()) tables.push_back(table.name);
+  db.PrepareBulkChange();
   Store::Transaction transaction(db);
   db.CopyTablesFrom(file, tables);
   transaction.Commit();

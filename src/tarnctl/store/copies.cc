@@ -42,6 +42,9 @@ void Db::CopyTo(const std::string& file) {
   const char* name = sqlite3_db_filename(handle_, "main");
   const std::string host = name != nullptr ? name : "";
   if (host.empty()) throw Error("a host in memory has no file to copy");
+  if (depth_ > 0 && ChangeCount() != changesAtBegin_) {
+    throw Error("cannot copy it with changes not committed yet");
+  }
   // Between runs the file alone holds the host; a commit that waits in the
   // log (its copy into the file failed) would be missing from the copy.
   struct stat log;
@@ -97,10 +100,24 @@ void Db::CopyTablesFrom(const std::string& file, const std::vector<std::string>&
   if (sqlite3_db_filename(handle_, kCopied) != nullptr) {
     Exec(std::string("DETACH ") + kCopied);
   }
-  Prepare(std::string("ATTACH ?1 AS ") + kCopied).Bind(1, file).Run();
+  // Run here rather than prepared through the statement cache: these name
+  // a database that only this call attaches.
+  sqlite3_stmt* statement = nullptr;
+  auto step = [&](const std::string& sql, const std::string* text) {
+    int64_t value = -1;
+    if (sqlite3_prepare_v2(handle_, sql.c_str(), -1, &statement, nullptr) != SQLITE_OK) Fail();
+    if (text != nullptr) sqlite3_bind_text(statement, 1, text->c_str(), -1, SQLITE_STATIC);
+    const int rc = sqlite3_step(statement);
+    if (rc == SQLITE_ROW) value = sqlite3_column_int64(statement, 0);
+    sqlite3_finalize(statement);
+    if (rc != SQLITE_ROW && rc != SQLITE_DONE) Fail();
+    return value;
+  };
+  step(std::string("ATTACH ?1 AS ") + kCopied, &file);
+  // Read through a mapping: no system call a page.
+  Exec(std::string("PRAGMA ") + kCopied + ".mmap_size=1073741824");
   auto pragma = [&](const char* name) {
-    auto statement = Prepare(std::string("PRAGMA ") + kCopied + "." + name);
-    return statement.Step() ? statement.Int(0) : -1;
+    return step(std::string("PRAGMA ") + kCopied + "." + name, nullptr);
   };
   if (pragma("application_id") != kApplicationId || pragma("user_version") != kSchemaVersion) {
     throw Error(file + " is not a copy of a host of schema version " +
