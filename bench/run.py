@@ -45,8 +45,13 @@ DURABLE_FSYNCS = 2          # fsync-family calls of one change
 LIST_US_PER_GROUP = 2.0     # -l at 100,000 port groups
 LIST_PEAK_MIB = 16          # -l at 100,000 port groups
 DUMP_LOAD_S = 1.0           # tarnhost dump and load of 100,000 port groups
+SNAPSHOT_S = 0.2            # tarnhost snapshot save and restore of 100,000 port groups
+DIFF_S = 1.0                # tarnhost diff of two hosts of 100,000 port groups
 
 SMALL, LARGE, HUGE = 10, 10_000, 100_000  # port groups of the hosts
+# On the big host, which keeps the snapshot "bench" of itself: the diff
+# compares two hosts of its size (the host and the snapshot).
+SNAPSHOT_COMMANDS = [["snapshot", "save", "copy"], ["snapshot", "restore", "bench"], ["diff", "bench"]]
 COMPARED = f"{LARGE:,} vs {SMALL:,} port groups"
 
 # Commands about one object. A pair undoes its first half, so that every
@@ -152,6 +157,8 @@ class Bench:
         self.dump_file = os.path.join(self.huge.home, "dump.json")
         with open(self.dump_file, "wb") as f:
             f.write(tarnhost(self.tarnhost, self.huge.env, "dump"))
+        # restore and diff meet the host as saved: every run leaves it so
+        tarnhost(self.tarnhost, self.huge.env, "snapshot", "save", "bench")
 
     def reset_scratch(self):
         tarnhost(self.tarnhost, self.scratch.env, "init", "--empty")
@@ -172,7 +179,8 @@ class Bench:
                    for _ in range(3))
         floor = peak_rss_kib(["/bin/true"], self.huge.env, os.path.join(self.huge.home, "true"))
         dump, = self.count(self.huge, [[self.tarnhost, "dump"]])
-        return lst, peak, floor, dump
+        snapshots = self.count(self.huge, [[self.tarnhost, *a] for a in SNAPSHOT_COMMANDS])
+        return lst, peak, floor, dump, snapshots
 
     def count_all(self):
         load = [self.tarnhost, "load", self.dump_file]
@@ -188,7 +196,7 @@ class Bench:
             c = {name: f.result() for name, f in futures.items()}
         self.counts_small, self.counts_large = c["small"], c["large"]
         self.counts_c, self.counts_true = c["start"]
-        self.counts_list, self.peak_kib, self.floor_kib, self.counts_dump = c["big"]
+        self.counts_list, self.peak_kib, self.floor_kib, self.counts_dump, self.counts_snapshots = c["big"]
         self.counts_load = c["load"]
 
     # -- wall time (one run at a time) ---------------------------------------
@@ -204,9 +212,11 @@ class Bench:
         t = time_interleaved({
             "-l": (self.huge.env, [[self.tool, "-l"]], None),
             "dump": (self.huge.env, [[self.tarnhost, "dump"]], None),
+            **{" ".join(a): (self.huge.env, [[self.tarnhost, *a]], None) for a in SNAPSHOT_COMMANDS},
             "load": (self.scratch.env, [[self.tarnhost, "load", self.dump_file]],
                      self.reset_scratch)}, self.big_runs)
         self.wall_list, self.wall_dump, self.wall_load = (t[k] for k in ("-l", "dump", "load"))
+        self.wall_snapshots = [t[" ".join(a)] for a in SNAPSHOT_COMMANDS]
 
     # -- report ---------------------------------------------------------------
     def measurements(self):
@@ -230,6 +240,8 @@ class Bench:
         add("-l", big, self.wall_list, self.counts_list)
         add("tarnhost dump", big, self.wall_dump, self.counts_dump)
         add("tarnhost load", big, self.wall_load, self.counts_load)
+        for a, runs, c in zip(SNAPSHOT_COMMANDS, self.wall_snapshots, self.counts_snapshots):
+            add("tarnhost " + " ".join(a), big, runs, c)
         return table(["command", "port groups", "wall ms median [min-max]", "cpu ms min",
                       *COUNT_NAMES], rows)
 
@@ -270,6 +282,10 @@ class Bench:
         for name, spread in (("dump", self.wall_dump), ("load", self.wall_load)):
             rows.append(wall_row(f"tarnhost {name} wall time ({number(g)})", Spread.limit(spread), limit,
                                  f"<= {limit * 1e3:g} ms", lambda v: f"{v * 1e3:.0f} ms"))
+        for a, spread in zip(SNAPSHOT_COMMANDS, self.wall_snapshots):
+            limit = (DIFF_S if a[0] == "diff" else SNAPSHOT_S) * g / HUGE
+            rows.append(wall_row(f"tarnhost {' '.join(a)} wall time ({number(g)})", Spread.limit(spread),
+                                 limit, f"<= {limit * 1e3:g} ms", lambda v: f"{v * 1e3:.0f} ms"))
         return rows
 
 

@@ -19,12 +19,19 @@ std::string OptionDef::Usage() const {
 std::string Syntax::Synopsis() const {
   std::string text;
   auto add = [&](const std::string& part) { text += (text.empty() ? "" : " ") + part; };
-  for (const auto& a : arguments) {
-    const std::string name = std::string(a.name) + (a.repeats ? "..." : "");
-    add(a.optional ? "[" + name + "]" : name);
-  }
+  auto addArguments = [&] {
+    for (const auto& a : arguments) {
+      const std::string name = std::string(a.name) + (a.repeats ? "..." : "");
+      add(a.optional ? "[" + name + "]" : name);
+    }
+  };
+  if (!rest) addArguments();
   for (const auto& o : options) {
     add("[" + o.Usage() + "]" + (o.repeatable ? "..." : ""));
+  }
+  if (rest) {
+    add("--");
+    addArguments();
   }
   return text;
 }
@@ -56,7 +63,10 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
     if (!mistake) mistake = why;
   };
   bool optionsEnded = false;
-  for (size_t i = 0; i < words.size(); ++i) {
+  // With syntax.rest, the options end at "--" and the arguments follow.
+  const auto end = syntax.rest ? std::find(words.begin(), words.end(), "--") : words.end();
+  const size_t own = end - words.begin();
+  for (size_t i = 0; i < own; ++i) {
     const std::string& word = words[i];
     if (optionsEnded || !IsOptionWord(word)) {
       positional_.push_back(word);
@@ -84,7 +94,7 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
     if (known->TakesValue()) {
       if (eq != std::string::npos) {
         value = word.substr(eq + 1);
-      } else if (i + 1 < words.size()) {
+      } else if (i + 1 < own) {
         value = words[++i];
       } else {
         refuse("option --" + name + " needs a value");
@@ -95,6 +105,11 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
     auto& slot = values_[name];
     if (!slot.empty() && !known->repeatable) refuse("option --" + name + " given twice");
     slot.push_back(value);
+  }
+  if (syntax.rest) {
+    if (!positional_.empty()) refuse("unexpected argument " + positional_[0] + " before --");
+    if (end == words.end()) refuse("missing -- before " + std::string(syntax.arguments[0].name));
+    positional_.assign(end == words.end() ? end : end + 1, words.end());
   }
   if (help_) return;
   if (mistake) throw UsageError(*mistake);

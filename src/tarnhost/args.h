@@ -40,6 +40,7 @@ enum class Kind {
   Object,    // any named object: switch, portset, port group, DVPort id
   Showable,  // what show NAME shows: switch, port group, DVS:PORTID
   Fault,     // the number of an armed fault
+  Snapshot,  // the name of a snapshot of the host
 };
 
 struct OptionDef {
@@ -64,6 +65,9 @@ struct Syntax {
   std::vector<ArgumentDef> arguments = {};
   std::vector<OptionDef> options = {};
   bool raw = false;  // every word is an argument: no options, no --help
+  // The arguments are the words after "--", taken as they are (a command
+  // line); the options come before it.
+  bool rest = false;
 
   const OptionDef* Option(const std::string& name) const;
   // The arguments and options as usage text shows them.

@@ -1,10 +1,14 @@
 #include "tarnhost/commands.h"
 
+#include <dirent.h>
 #include <sys/stat.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cerrno>
+#include <csignal>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <optional>
 #include <string>
@@ -12,6 +16,7 @@
 
 #include "hostctl/exception.h"
 #include "hostctl/network.h"
+#include "tarnctl/admin/diff.h"
 #include "tarnctl/admin/distributed.h"
 #include "tarnctl/admin/dvport.h"
 #include "tarnctl/admin/faults.h"
@@ -19,6 +24,7 @@
 #include "tarnctl/admin/listing.h"
 #include "tarnctl/admin/opaque.h"
 #include "tarnctl/admin/pnic.h"
+#include "tarnctl/admin/snapshots.h"
 #include "tarnctl/admin/standard.h"
 #include "tarnctl/admin/timeouts.h"
 #include "tarnctl/admin/whole_host.h"
@@ -111,6 +117,119 @@ std::string ReadFile(const std::string& path) {
   return text;
 }
 
+// A state of the host to compare, open privately: a snapshot of the host,
+// or a dump (a file, "-": standard input) loaded into a host in memory.
+class State {
+ public:
+  explicit State(const std::string& source) {
+    const std::string host = Admin::HostPath();
+    if (source != "-" && Admin::HasSnapshot(host, source)) {
+      snapshot_ = Admin::OpenSnapshot(host, source);
+      return;
+    }
+    struct stat info;
+    if (source != "-" && stat(source.c_str(), &info) != 0 && errno == ENOENT) {
+      throw HostCtl::Lib::HostCtlException(
+          "No snapshot or file named " + source + " (tarnhost snapshot list lists the snapshots)",
+          "");
+    }
+    const std::string text = ReadFile(source);
+    dump_.emplace(Admin::Host::Open(TarnCtl::Store::Location::Memory(source)));
+    Admin::LoadHost(dump_->db(), text);
+  }
+  Db& db() { return snapshot_ ? *snapshot_ : dump_->db(); }
+
+ private:
+  std::unique_ptr<Db> snapshot_;
+  std::optional<Admin::Host> dump_;
+};
+
+std::string DiffOutput(const std::vector<Admin::Difference>& differences, bool json) {
+  if (!json) return Admin::DiffText(differences);
+  return Admin::DiffJson(differences).dump(2, ' ', false, Admin::Json::error_handler_t::replace) +
+         "\n";
+}
+
+std::string SnapshotName(const Args& args) {
+  const std::string& name = args.Positional(0);
+  const std::string problem = Admin::SnapshotNameProblem(name);
+  if (!problem.empty()) {
+    throw UsageError("snapshot name " + name + " " + problem + " (a name is 1 to " +
+                     std::to_string(Admin::kSnapshotNameMax) +
+                     " bytes without '/' or a control character, not starting with '.')");
+  }
+  return name;
+}
+
+// A folder of its own for `tarnhost try`, removed with what is in it when
+// the object goes.
+class ScratchFolder {
+ public:
+  ScratchFolder() {
+    const char* tmp = std::getenv("TMPDIR");
+    path_ = std::string(tmp && *tmp ? tmp : "/tmp") + "/tarnhost-try.XXXXXX";
+    if (mkdtemp(path_.data()) == nullptr) {
+      throw HostCtl::Lib::HostCtlException(
+          "cannot create a folder for the copy of the host: " + std::string(std::strerror(errno)),
+          "");
+    }
+  }
+  ~ScratchFolder() {
+    if (DIR* folder = opendir(path_.c_str())) {
+      while (const dirent* entry = readdir(folder)) {
+        const std::string name = entry->d_name;
+        if (name != "." && name != "..") unlink((path_ + "/" + name).c_str());
+      }
+      closedir(folder);
+    }
+    rmdir(path_.c_str());
+  }
+  ScratchFolder(const ScratchFolder&) = delete;
+  ScratchFolder& operator=(const ScratchFolder&) = delete;
+  const std::string& path() const { return path_; }
+
+ private:
+  std::string path_;
+};
+
+// Runs `command` with `environment` added, as the shell would (its exit
+// status; 128 + the signal that killed it; 127 when it cannot be run).
+// Interrupts from the terminal are the command's while it runs.
+int RunCommand(const std::vector<std::string>& command,
+               const std::vector<std::pair<const char*, std::string>>& environment) {
+  std::fflush(stdout);
+  std::fflush(stderr);
+  struct sigaction ignore = {}, oldInt, oldQuit;
+  ignore.sa_handler = SIG_IGN;
+  sigaction(SIGINT, &ignore, &oldInt);
+  sigaction(SIGQUIT, &ignore, &oldQuit);
+  const pid_t child = fork();
+  if (child == 0) {
+    sigaction(SIGINT, &oldInt, nullptr);
+    sigaction(SIGQUIT, &oldQuit, nullptr);
+    for (const auto& [name, value] : environment) setenv(name, value.c_str(), 1);
+    std::vector<char*> argv;
+    for (const auto& word : command) argv.push_back(const_cast<char*>(word.c_str()));
+    argv.push_back(nullptr);
+    execvp(argv[0], argv.data());
+    std::fprintf(stderr, "tarnhost: cannot run %s: %s\n", argv[0], std::strerror(errno));
+    _exit(127);
+  }
+  int status = 0;
+  const int error = errno;
+  bool waited = child > 0;
+  while (waited && waitpid(child, &status, 0) < 0) {
+    if (errno != EINTR) waited = false;
+  }
+  sigaction(SIGINT, &oldInt, nullptr);
+  sigaction(SIGQUIT, &oldQuit, nullptr);
+  if (child < 0) {
+    throw HostCtl::Lib::HostCtlException(
+        "cannot run " + command[0] + ": " + std::string(std::strerror(error)), "");
+  }
+  return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+}
+
 }  // namespace
 
 // A failed write is the host tool's own failure (exit status 1), reported
@@ -159,6 +278,93 @@ int Load(const Args& args) {
 
 int Reboot(const Args&) {
   return OnHost([](Db& db) { Admin::Reboot(db); });
+}
+
+int Diff(const Args& args) {
+  const auto& given = args.Positionals();
+  const bool layers = args.Has("layers");
+  if (layers && !given.empty()) throw UsageError("--layers compares the host's own layers");
+  if (!layers && given.empty()) throw UsageError("missing A");
+  try {
+    // The host is opened only to be compared: a snapshot, replaced by a
+    // rename, stays as it was opened, and `tarnhost dump | tarnhost diff
+    // A -` must not wait for the host's lock.
+    std::vector<Admin::Difference> differences;
+    if (layers) {
+      differences = Admin::DiffLayers(Admin::Host().db());
+    } else if (given.size() == 1) {
+      State from(given[0]);
+      differences = Admin::DiffHosts(from.db(), Admin::Host().db());
+    } else {
+      State from(given[0]), to(given[1]);
+      differences = Admin::DiffHosts(from.db(), to.db());
+    }
+    Print(DiffOutput(differences, args.Has("json")));
+    return differences.empty() ? 0 : 1;
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    std::fprintf(stderr, "tarnhost: %s\n", Admin::Reason(e).c_str());
+  } catch (const std::exception& e) {
+    std::fprintf(stderr, "tarnhost: %s\n", e.what());
+  }
+  return 2;
+}
+
+int SaveSnapshot(const Args& args) {
+  const std::string name = SnapshotName(args);
+  return OnHost([&](Db& db) { Admin::SaveSnapshot(db, Admin::HostPath(), name); });
+}
+
+int RestoreSnapshot(const Args& args) {
+  const std::string name = SnapshotName(args);
+  return OnHost([&](Db& db) { Admin::RestoreSnapshot(db, Admin::HostPath(), name); });
+}
+
+int ListSnapshots(const Args&) {
+  std::string text;
+  for (const auto& name : Admin::Snapshots(Admin::HostPath())) text += name + "\n";
+  return Print(text);
+}
+
+int RemoveSnapshot(const Args& args) {
+  const std::string name = SnapshotName(args);
+  return OnHost([&](Db&) { Admin::RemoveSnapshot(Admin::HostPath(), name); });
+}
+
+int Try(const Args& args) {
+  ScratchFolder folder;
+  const std::string copy = folder.path() + "/host.db", trace = folder.path() + "/trace";
+  // Copied under the host's lock, which goes before the command runs.
+  OnHost([&](Db& db) { Admin::CopyHost(db, copy); });
+  std::vector<std::pair<const char*, std::string>> environment = {{"TARN_HOST_DB", copy}};
+  if (args.Has("trace")) environment.push_back({"TARN_TRACE", trace});
+  const int status = RunCommand(args.Positionals(), environment);
+
+  std::vector<Admin::Difference> differences;
+  {
+    Admin::Host host;
+    Admin::Host tried = Admin::Host::Open(TarnCtl::Store::Location::File(copy), {.create = false});
+    differences = Admin::DiffHosts(host.db(), tried.db());
+  }
+  const bool json = args.Has("json");
+  if (!args.Has("trace")) {
+    Print(DiffOutput(differences, json));
+    return status;
+  }
+  std::string calls;
+  if (access(trace.c_str(), F_OK) == 0) calls = ReadFile(trace);
+  if (!json) {
+    Print(DiffOutput(differences, false) + calls);
+    return status;
+  }
+  Admin::Json lines = Admin::Json::array();
+  for (size_t start = 0; start < calls.size();) {
+    const size_t end = calls.find('\n', start);
+    lines.push_back(calls.substr(start, end - start));
+    start = end == std::string::npos ? calls.size() : end + 1;
+  }
+  Admin::Json document = {{"diff", Admin::DiffJson(differences)}, {"trace", lines}};
+  Print(document.dump(2, ' ', false, Admin::Json::error_handler_t::replace) + "\n");
+  return status;
 }
 
 int Path(const Args&) {

@@ -3,7 +3,9 @@
 #include <algorithm>
 
 #include "tarnctl/admin/faults.h"
+#include "tarnctl/admin/host.h"
 #include "tarnctl/admin/listing.h"
+#include "tarnctl/admin/snapshots.h"
 #include "tarnhost/commands.h"
 #include "tarnhost/table.h"
 
@@ -55,6 +57,8 @@ Words Candidates(Kind kind, const Words& given) {
       return NextWords(given);
     case Kind::Operation:
       return FaultOperationNames();
+    case Kind::Snapshot:
+      return TarnCtl::Admin::Snapshots(TarnCtl::Admin::HostPath());
     default:
       for (const auto& host : kHostKinds) {
         if (host.kind == kind) {

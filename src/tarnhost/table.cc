@@ -74,6 +74,54 @@ const std::vector<Command>& Commands() {
        .help = "The document is checked first: a malformed or inconsistent dump is refused as a "
                "whole and the host stays as it was.",
        .run = Load},
+      {.words = {"diff"},
+       .syntax = {.arguments = {{"A", Kind::File, true}, {"B", Kind::File, true}},
+                  .options = {{.name = "layers",
+                               .help = "the stored configuration against the running state"},
+                              {.name = "json", .help = "as a JSON array of records"}}},
+       .summary = "print how two states of the host differ, object by object",
+       .help = "A and B are each a snapshot's name or a dump file (- : standard input); A alone "
+               "is compared with the host. A line for each changed field, naming the object and "
+               "the layers it changed in: 'portgroup Test [running, stored]: vlan 43 -> 100'; "
+               "'+ KIND NAME' for an object that came, '- KIND NAME' for one that went; objects "
+               "in creation order. --layers compares the host's stored configuration with its "
+               "running state: what a reboot would lose and a restore bring back. --json prints "
+               "records of kind, name, layer, field, from and to.\nExit status as diff's: 0 "
+               "equal, 1 different, 2 trouble.",
+       .run = Diff},
+      {.words = {"snapshot", "save"},
+       .syntax = {.arguments = {{"NAME", Kind::Snapshot}}},
+       .summary = "keep the whole host as a snapshot named NAME",
+       .help = "Replaces a snapshot of that name. Snapshots are files in the folder PATH.snapshots "
+               "beside the host file PATH; a snapshot holds every table of the host, its faults "
+               "and events too. NAME is 1 to 64 bytes, without '/' or a control character, and "
+               "does not start with '.'.",
+       .run = SaveSnapshot},
+      {.words = {"snapshot", "restore"},
+       .syntax = {.arguments = {{"NAME", Kind::Snapshot}}},
+       .summary = "replace the host with a snapshot",
+       .help = "In one transaction, as a load: faults and events become the snapshot's too.",
+       .run = RestoreSnapshot},
+      {.words = {"snapshot", "list"},
+       .summary = "list the snapshots of the host",
+       .help = "Their names, a line each, in byte order.",
+       .run = ListSnapshots},
+      {.words = {"snapshot", "del"},
+       .syntax = {.arguments = {{"NAME", Kind::Snapshot}}},
+       .summary = "remove a snapshot",
+       .run = RemoveSnapshot},
+      {.words = {"try"},
+       .syntax = {.arguments = {{"COMMAND"}, {"ARGS", Kind::Text, true, true}},
+                  .options = {{.name = "json", .help = "the differences as JSON"},
+                              {.name = "trace", .help = "then the calls COMMAND made"}},
+                  .rest = true},
+       .summary = "run a command on a copy of the host and print what it changed",
+       .help = "Runs COMMAND with TARN_HOST_DB naming a private copy of the host, then prints how "
+               "the copy differs from the host, as 'tarnhost diff' does; the host is not changed "
+               "and the copy is removed. With --trace, the call trace of the run follows (with "
+               "--json: an object of \"diff\" and \"trace\", its lines). Exit status: "
+               "COMMAND's.",
+       .run = Try},
       {.words = {"reboot"},
        .summary = "drop the running state, keep the stored configuration",
        .help = "As a restart of the host would.",

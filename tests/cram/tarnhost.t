@@ -115,7 +115,7 @@ exactly, the commands and options of the table as the usage shows it, and
 the operations as `fault ops` lists them.
 
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
-  36 commands, 20 options, 71 operations compared
+  42 commands, 24 options, 71 operations compared
 
 The default host as a dump; refusals of the host: "tarnhost: " and the
 reason with its explanation, status 1, nothing changed (each refusal's

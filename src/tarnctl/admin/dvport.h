@@ -19,6 +19,8 @@ struct DVPort {
   std::string portId;
   uint32_t connectionId = 0;
   std::vector<std::string> clients;
+
+  bool operator==(const DVPort&) const = default;
 };
 
 struct DVPortSeed {

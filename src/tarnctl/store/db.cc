@@ -369,6 +369,7 @@ Transaction::Transaction(Db& db) : db_(db), depth_(db.depth_) {
     throw db_.Error("the run's earlier changes were undone after a failure");
   }
   db_.Exec(depth_ == 0 ? "BEGIN IMMEDIATE" : "SAVEPOINT inner");
+  if (depth_ == 0) db_.changesAtBegin_ = db_.ChangeCount();
   ++db_.depth_;
 }
 

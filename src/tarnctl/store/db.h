@@ -130,6 +130,18 @@ class Db {
   // than spilling there and being read back.
   void PrepareBulkChange();
 
+  // Copies the host file, as the last commit left it, to the file `file`,
+  // whole or not at all: into `file`.new beside it, synced, renamed over
+  // `file` and the directory synced. The copy is a database file alone,
+  // without a log. Refused for a database in memory, and while a commit
+  // waits in the log, or once the open transaction changed anything (the
+  // copy would miss it).
+  void CopyTo(const std::string& file);
+  // Replaces every row of `tables` with the rows of the same tables of the
+  // file `file`, a copy that CopyTo made of a host of this schema version,
+  // inside the caller's transaction. Refuses another file.
+  void CopyTablesFrom(const std::string& file, const std::vector<std::string>& tables);
+
   Statement Prepare(const std::string& sql);
   // Runs SQL without results (several statements allowed).
   void Exec(const std::string& sql);
@@ -188,6 +200,7 @@ class Db {
   bool readOnly_ = false;      // opened with Access::kRead
   const char* context_ = nullptr;
   int depth_ = 0;
+  int64_t changesAtBegin_ = 0;  // ChangeCount() when the outermost transaction began
   // The copy of the log into the file after the last commit failed with
   // this SQLite code (0: it did not fail); set by the commit hook.
   int copyFailed_ = 0;

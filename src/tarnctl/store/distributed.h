@@ -23,6 +23,8 @@ struct Row {
   int32_t version = 0;
   uint32_t numPorts = 0;
   uint32_t mtu = 0;
+
+  bool operator==(const Row&) const = default;
 };
 
 struct Named {
@@ -33,6 +35,8 @@ struct Named {
 struct Uplink {
   std::string pnic;
   std::optional<std::string> portId;  // the DVPort it was added to
+
+  bool operator==(const Uplink&) const = default;
 };
 
 std::optional<Row> Find(Db& db, Layer layer, const std::string& name);

@@ -26,6 +26,8 @@ struct Row {
   std::string detail;
   int64_t skip = 0;
   int64_t times = 1;
+
+  bool operator==(const Row&) const = default;
 };
 
 std::vector<Row> List(Db& db);

@@ -18,6 +18,8 @@ struct Row {
   uint32_t numPorts = 0;
   uint32_t usedPorts = 0;
   std::vector<std::string> uplinks;
+
+  bool operator==(const Row&) const = default;
 };
 
 struct Named {

@@ -22,6 +22,8 @@ struct Row {
   uint16_t vlan = 0;
   std::string policy;   // policy_codec.h, stored form
   int64_t clients = 0;  // read only: the clients on the port group
+
+  bool operator==(const Row&) const = default;
 };
 
 struct Named {

@@ -22,6 +22,8 @@ struct Row {
   int32_t cdp = 0;
   bool system = false;
   std::string policy;  // policy_codec.h, stored form
+
+  bool operator==(const Row&) const = default;
 };
 
 struct Named {

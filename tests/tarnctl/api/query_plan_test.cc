@@ -1,7 +1,7 @@
 // Every statement the library prepares in any test of this program reads
 // only what it needs: its query plan scans no table that grows with the
 // host, except in the steps that must read whole tables (listings, show,
-// dump, load, reboot and restore).
+// dump, load, reboot, restore and diff).
 // Each test's process checks the statements it saw when it ends.
 #include <gtest/gtest.h>
 
@@ -25,7 +25,8 @@ const std::set<std::string> kGrowing = {"vswitch",      "portgroup",  "link",   
                                         "lag_timeout",  "pnic"};
 // The steps that read whole tables by their nature: the listings of the
 // library and of tarnhost, the dump and load, a reboot (all of the running
-// state goes) and the restores (all of the stored configuration comes back).
+// state goes), the restores (all of the stored configuration comes back)
+// and the diff of two hosts.
 const std::set<std::string> kWholeTable = {"GetVirtualSwitches",
                                            "GetDVSwitches",
                                            "GetOpaqueSwitches",
@@ -34,6 +35,7 @@ const std::set<std::string> kWholeTable = {"GetVirtualSwitches",
                                            "RestoreDVSwitches",
                                            "Show",
                                            "Dump",
+                                           "Diff",
                                            "Load",
                                            "List",
                                            "Reboot"};
