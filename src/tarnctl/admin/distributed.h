@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "tarnctl/admin/view.h"
+#include "tarnctl/model/limits.h"
 #include "tarnctl/store/distributed.h"
 #include "tarnctl/store/layer.h"
 
@@ -24,8 +25,8 @@ struct DVSwitchSeed {
   std::string name;
   std::optional<std::string> portset;   // default: the name
   std::optional<std::string> switchId;  // default: derived from the name, unique
-  int32_t ports = 128;
-  uint32_t mtu = 1500;
+  int32_t ports = Model::kDefaultPorts;
+  uint32_t mtu = Model::kDefaultMtu;
   std::vector<std::string> uplinks;  // pnics, must be free
 };
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "tarnctl/admin/view.h"
+#include "tarnctl/model/limits.h"
 #include "tarnctl/store/opaque.h"
 
 namespace TarnCtl::Admin {
@@ -17,7 +18,7 @@ using OpaqueSwitch = Store::Opaque::Named;
 struct OpaqueSeed {
   std::string name;
   std::optional<std::string> portset;  // default: the name
-  int32_t ports = 128;
+  int32_t ports = Model::kDefaultPorts;
   int32_t used = 0;
   std::vector<std::string> uplinks;
 };

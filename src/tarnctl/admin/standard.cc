@@ -125,7 +125,7 @@ std::vector<std::string> PortGroupNames(Store::Db& db) {
 
 void AddSystemSwitch(Store::Db& db, const std::string& name, int32_t ports) {
   Scope scope(db, "AddSystemSwitch");
-  Api::CreateStandardSwitch(db, name, ports, Model::NewSystemSwitchPolicy(), true);
+  Api::CreateStandardSwitch(db, name, ports, Model::DefaultTeamingPolicy(), true);
 }
 
 void RemoveSystemSwitch(Store::Db& db, const std::string& name) {

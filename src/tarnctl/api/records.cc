@@ -5,6 +5,7 @@
 #include "tarnctl/api/session.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/model/limits.h"
+#include "tarnctl/model/teaming.h"
 
 namespace HostCtl::Network {
 
@@ -21,9 +22,7 @@ TarnCtl::Store::Db* OpenDb() {
 
 NicTeamingPolicy NicTeamingPolicy::GetDefaultPolicy() {
   TARN_CALL(OpenDb(), GetDefaultPolicy, Of("NicTeamingPolicy"));
-  NicTeamingPolicy policy;
-  policy.flags = kUplinkOrderSet;
-  return policy;
+  return TarnCtl::Model::DefaultTeamingPolicy();
 }
 
 NicCapabilities NicCapabilities::GetDefaultPolicy() {

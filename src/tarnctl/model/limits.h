@@ -7,6 +7,8 @@
 #include <limits>
 #include <string>
 
+#include "tarnctl/store/default_host.h"
+
 namespace TarnCtl::Model {
 
 struct Range {
@@ -40,8 +42,9 @@ inline constexpr Range kFaultTimes{"Invalid times {}", 1, kInt32Max, "(it must b
 inline constexpr Range kSeq{"Invalid sequence number {}", 1, int64_t{1} << 53};
 
 // What a new switch starts with.
-inline constexpr uint32_t kDefaultMtu = 1500;
-inline constexpr int32_t kDefaultCdpStatus = 1;
+inline constexpr int32_t kDefaultPorts = Store::kDefaultPorts;
+inline constexpr uint32_t kDefaultMtu = Store::kDefaultMtu;
+inline constexpr int32_t kDefaultCdpStatus = Store::kDefaultCdpStatus;
 
 bool Within(const Range& range, int64_t value);
 // Refuses a value outside `range`.

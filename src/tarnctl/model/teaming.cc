@@ -26,7 +26,7 @@ NicTeamingPolicy NewPortGroupPolicy() {
   return {};
 }
 
-NicTeamingPolicy NewSystemSwitchPolicy() {
+NicTeamingPolicy DefaultTeamingPolicy() {
   NicTeamingPolicy policy;
   policy.flags = NicTeamingPolicy::kUplinkOrderSet;
   return policy;

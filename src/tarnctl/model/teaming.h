@@ -13,7 +13,8 @@ void CheckTeamingPolicy(const HostCtl::Network::NicTeamingPolicy& policy);
 
 // A new port group's policy: no uplink order of its own.
 HostCtl::Network::NicTeamingPolicy NewPortGroupPolicy();
-// A system switch's policy: an explicit, empty uplink order.
-HostCtl::Network::NicTeamingPolicy NewSystemSwitchPolicy();
+// The library's default policy (GetDefaultPolicy), which a new system
+// switch starts with: an explicit, empty uplink order.
+HostCtl::Network::NicTeamingPolicy DefaultTeamingPolicy();
 
 }  // namespace TarnCtl::Model

@@ -263,7 +263,7 @@ std::string JournalPath(const std::string& path, const struct stat& info) {
 void BuildDefaultHost(Db& db) {
   Transaction transaction(db);
   db.Exec("PRAGMA application_id=" + std::to_string(kApplicationId) + "; PRAGMA user_version=" +
-          std::to_string(kSchemaVersion) + ";" + kSchemaSql + kDefaultHostSql);
+          std::to_string(kSchemaVersion) + ";" + kSchemaSql + HostSql(true));
   transaction.Commit();
 }
 

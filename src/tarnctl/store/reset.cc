@@ -39,7 +39,7 @@ void Rebuild(Db& db, bool empty) {
                                          : "TRIGGER") +
             " IF EXISTS " + Quoted(name));
   }
-  db.Exec(std::string(kSchemaSql) + (empty ? kEmptyHostSql : kDefaultHostSql));
+  db.Exec(std::string(kSchemaSql) + HostSql(!empty));
 }
 
 void Reboot(Db& db) {
