@@ -5,7 +5,6 @@
 #include "cli/dispatch.h"
 
 #include <array>
-#include <cstdlib>
 #include <iostream>
 #include <memory>
 
@@ -36,6 +35,8 @@ enum class Lookup {
   kVirtualSwitchOrDVS,  // the standard switch, else the distributed one
   kPortset,             // GetPortsetById(switchName)
   kPortsetAfterSignal,  // the same, after signalling the device manager for -f
+  kPortGroupSwitch,     // GetVirtualSwitchById, once -p names a known port group;
+                        // a failure ends the run with its short message
 };
 
 // The objects a step owns while its body runs; released when the step ends.
@@ -87,6 +88,14 @@ Target LookUp(Lookup lookup, const CommandOptions& options) {
       break;
     case Lookup::kPortset:
       target.portset = NetworkFactory::GetPortsetById(name);
+      break;
+    case Lookup::kPortGroupSwitch:
+      Commands::CheckKnownPortGroup(options.portGroupName);
+      try {
+        target.sw = NetworkFactory::GetVirtualSwitchById(name, kDefaultGet);
+      } catch (const HostCtl::Lib::HostCtlException& e) {
+        throw Commands::Failure{1, e.GetMessage()};
+      }
       break;
   }
   return target;
@@ -154,9 +163,9 @@ const std::array<Step, 26> kChain = {{
      Status::kSet},
     {Bit::kGetMaxActive, Lookup::kVirtualSwitch,
      [](StepContext& c) { return Commands::GetMaxActive(*c.target.sw); }, Status::kSet},
-    {Bit::kAddPgUplink | Bit::kDelPgUplink, Lookup::kNone,
+    {Bit::kAddPgUplink | Bit::kDelPgUplink, Lookup::kPortGroupSwitch,
      [](StepContext& c) {
-       Commands::EditPortgroupUplinks(c.options.switchName, c.options.portGroupName,
+       Commands::EditPortgroupUplinks(*c.target.sw, c.options.switchName, c.options.portGroupName,
                                       c.options.uplinkName, c.Has(Bit::kAddPgUplink));
        return 0;
      },
@@ -246,20 +255,35 @@ int RunChain(const CommandOptions& options, VirtualSwitchInfo& info) {
   return status;
 }
 
+// Writes the line of a failure that ends the run; its status.
+int Report(const Commands::Failure& failure) {
+  (failure.toStandardOutput ? std::cout : std::cerr) << failure.line << std::endl;
+  return failure.status;
+}
+
 }  // namespace
 
 int RunCommands(CommandOptions& options, int argc, char** argv, int firstOperand) {
   CheckArguments(options, argc, argv, firstOperand);
   if ((options.mask & Bit::kEnsReady) != 0) {
-    Commands::ActivateEnsNode();
-    std::exit(0);
+    try {
+      Commands::ActivateEnsNode();
+      return 0;
+    } catch (const Commands::Failure& failure) {
+      return Report(failure);
+    }
   }
   try {
     // Declared in this order so that the switch information object is
     // released before the network information object, on every path.
     TarnCtl::Network::NetworkInfoImpl network;
     std::unique_ptr<VirtualSwitchInfo> info = network.GetVirtualSwitchInfo();
-    return RunChain(options, *info);
+    try {
+      return RunChain(options, *info);
+    } catch (const Commands::Failure& failure) {
+      // Written while the host is open: its changes are kept after the line.
+      return Report(failure);
+    }
   } catch (const HostCtl::Lib::HostCtlException& e) {
     std::cerr << e.GetDetailedMessage() << std::endl;
     return 1;
