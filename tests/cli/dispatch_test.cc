@@ -1,10 +1,12 @@
 // Runs of the whole front end in this process, on a host of the test's own:
-// the run status and the line that ends it.
+// the run status and the line that ends it; and the command sets that the
+// argument checks take from the step table.
 #include <gtest/gtest.h>
 
 #include <string>
 #include <vector>
 
+#include "cli/checks.h"
 #include "cli/dispatch.h"
 #include "hostctl/tarnctl.h"
 #include "scratch.h"
@@ -76,6 +78,14 @@ TEST_F(RunCommandsTest, EveryRunEndsWithItsStatusAndLine) {
     SCOPED_TRACE(testing::PrintToString(run.args));
     EXPECT_EQ(Run(run.args), std::make_pair(run.status, run.stderrText));
   }
+}
+
+// A new command that needs any of these changes its value here.
+TEST(CommandSets, TakenFromTheStepTable) {
+  EXPECT_EQ(Cli::kSwitchNameCommands, 0x2e0ffddbu);
+  EXPECT_EQ(Cli::kLengthExemptCommands, 0x30000u);
+  EXPECT_EQ(Cli::kPortGroupCommands, 0xc400u);
+  EXPECT_EQ(Cli::kDVPortCommands, 0x32000u);
 }
 
 }  // namespace
