@@ -47,11 +47,8 @@ Target LookUp(Lookup lookup, const CommandOptions& options) {
       break;
     case Lookup::kPortGroupSwitch:
       Commands::CheckKnownPortGroup(options.portGroupName);
-      try {
-        target.sw = NetworkFactory::GetVirtualSwitchById(name, kDefaultGet);
-      } catch (const HostCtl::Lib::HostCtlException& e) {
-        throw Commands::Failure{1, e.GetMessage()};
-      }
+      target.sw = Commands::OrEndWithMessage(
+          [&] { return NetworkFactory::GetVirtualSwitchById(name, kDefaultGet); });
       break;
   }
   return target;

@@ -10,6 +10,7 @@
 #include <string>
 
 #include "cli/options.h"
+#include "hostctl/exception.h"
 #include "hostctl/network.h"
 
 namespace Commands {
@@ -22,6 +23,17 @@ struct Failure {
   std::string line;
   bool toStandardOutput = false;
 };
+
+// Returns what `read` returns; a library failure ends the run with the
+// exception's message text alone.
+template <typename Read>
+auto OrEndWithMessage(Read read) -> decltype(read()) {
+  try {
+    return read();
+  } catch (const HostCtl::Lib::HostCtlException& e) {
+    throw Failure{1, e.GetMessage()};
+  }
+}
 
 // Switch creation and removal.
 int AddVswitch(HostCtl::Network::VirtualSwitchInfo& info, const std::string& name,
@@ -43,8 +55,8 @@ bool RemoveUplinkFromTeaming(const std::string& uplink, HostCtl::Network::NicTea
 int LinkPnic(HostCtl::Network::VirtualSwitch& sw, std::string pnic);
 int UnlinkPnic(HostCtl::Network::VirtualSwitch& sw, std::string pnic);
 // -M and -N: CheckKnownPortGroup comes before the lookup of `sw`, named
-// `switchName` on the command line. Both may throw a Failure; so does a
-// failure to read the switch's uplinks or port groups.
+// `switchName` on the command line, which like the reading of its uplinks
+// and port groups goes through OrEndWithMessage. Both may throw a Failure.
 void CheckKnownPortGroup(const std::string& portGroup);
 void EditPortgroupUplinks(HostCtl::Network::VirtualSwitch& sw, const std::string& switchName,
                           const std::string& portGroup, const std::string& uplink, bool add);

@@ -95,14 +95,8 @@ void CheckKnownPortGroup(const std::string& portGroup) {
 
 void EditPortgroupUplinks(HostCtl::Network::VirtualSwitch& sw, const std::string& switchName,
                           const std::string& portGroup, const std::string& uplink, bool add) {
-  std::vector<std::string> switchUplinks;
-  std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> groups;
-  try {
-    switchUplinks = sw.GetUplinks();
-    groups = sw.GetPortGroups();
-  } catch (const HostCtlException& e) {
-    throw Failure{1, e.GetMessage()};
-  }
+  const std::vector<std::string> switchUplinks = OrEndWithMessage([&] { return sw.GetUplinks(); });
+  auto groups = OrEndWithMessage([&] { return sw.GetPortGroups(); });
 
   const bool onSwitch = std::any_of(groups.begin(), groups.end(), [&](const auto& group) {
     return group->GetName() == portGroup;
