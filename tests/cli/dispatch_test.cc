@@ -63,7 +63,7 @@ TEST_F(RunCommandsTest, EveryRunEndsWithItsStatusAndLine) {
       {{"-M", "pnic3", "-p", "Management", "vswitch0"},
        1,
        "Uplink (pnic3) does not exist on the switch: vswitch0\n"},
-      {{"-N", "pnic0", "-p", "Management", "vswitch0"}, 0, ""},
+      {{"-M", "pnic0", "-p", "Management", "vswitch0"}, 0, ""},
       {{"-a", "-W", "-I", "etherswitch", "-n", "6", "dvs1"},
        1,
        "Implementation class etherswitch cannot be                backed by DVS 6.6\n"},
@@ -78,6 +78,11 @@ TEST_F(RunCommandsTest, EveryRunEndsWithItsStatusAndLine) {
     SCOPED_TRACE(testing::PrintToString(run.args));
     EXPECT_EQ(Run(run.args), std::make_pair(run.status, run.stderrText));
   }
+  // What the runs that went through did.
+  TarnCtl::Network::NetworkInfoImpl network;
+  EXPECT_TRUE(network.GetVirtualSwitchInfo()->SwitchExists("vs1"));
+  EXPECT_EQ(TarnCtl::Network::PortGroupImpl("Management").GetTeamingPolicy().uplinkOrder,
+            std::vector<std::string>{"pnic0"});
 }
 
 // A new command that needs any of these changes its value here.
