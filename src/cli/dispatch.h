@@ -8,7 +8,7 @@ namespace Cli {
 
 // Checks the positional argument and the companions of the chosen command,
 // then runs the dispatch chain. Returns the run status (the exit status);
-// may end the process itself where a check or a command says so.
+// only a failed argument check ends the process itself.
 int RunCommands(CommandOptions& options, int argc, char** argv, int firstOperand);
 
 }  // namespace Cli

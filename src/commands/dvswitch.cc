@@ -44,24 +44,20 @@ Implementation ChooseImplementation(const Cli::CommandOptions& options) {
   return {kCswitch, kDefaultCswitchVersion};
 }
 
-// Ends the run when the class cannot be backed by the version. The version
+// Ends the run (a Failure) when the class cannot be backed by the version. The version
 // is compared unsigned, so a negative one counts as a late version.
 void CheckBacking(const Implementation& impl) {
   const uint32_t version = static_cast<uint32_t>(impl.version);
   if (version > kLastEtherswitchVersion && impl.implClass == kEtherswitch) {
-    std::cerr << "Implementation class etherswitch cannot be                backed by DVS 6.6"
-              << std::endl;
-    std::exit(1);
+    throw Failure{1, "Implementation class etherswitch cannot be                backed by DVS 6.6"};
   }
   if (version <= kLastEtherswitchVersion && impl.implClass == kCswitch) {
-    std::cerr << "Implementation class cswitch can be backed                only from DVS 6.6"
-              << std::endl;
-    std::exit(1);
+    throw Failure{1, "Implementation class cswitch can be backed                only from DVS 6.6"};
   }
 }
 
 // The port named by `dvPortId` on `dvs`, with `param` holding its key.
-// Ends the run when the key names no valid port.
+// Ends the run (a Failure) when the key names no valid port.
 std::unique_ptr<TarnCtl::Network::DVPortImpl> OpenDVPort(HostCtl::Network::DVSwitch& dvs,
                                                          const std::string& dvPortId,
                                                          HostCtl::Network::DVPortParam& param) {
@@ -70,8 +66,7 @@ std::unique_ptr<TarnCtl::Network::DVPortImpl> OpenDVPort(HostCtl::Network::DVSwi
   param.connectionId = 0;
   auto port = std::make_unique<TarnCtl::Network::DVPortImpl>(param);
   if (!port->IsValid()) {
-    std::cerr << "Invalid DVPort params " << dvPortId << std::endl;
-    std::exit(1);
+    throw Failure{1, "Invalid DVPort params " + dvPortId};
   }
   return port;
 }

@@ -5,11 +5,10 @@
 #include <sys/types.h>
 
 #include <cstdint>
-#include <cstdlib>
 #include <fstream>
-#include <iostream>
 #include <limits>
 #include <optional>
+#include <string>
 
 #include "commands/commands.h"
 #include "hostctl/nodi.h"
@@ -57,13 +56,11 @@ void ActivateEnsNode() {
   uint32_t info = 0;
   const int status = NODI_CheckSig(&result, kNodiSigVersion, &info);
   if (status != 0) {
-    std::cerr << "NODI_CheckSig failed: " << TARN_ReturnStatusToString(status) << std::endl;
-    std::exit(1);
+    throw Failure{1, std::string("NODI_CheckSig failed: ") + TARN_ReturnStatusToString(status)};
   }
   NODI_ParamList* params = TarnCtl::Util::SysinfoUtil::GetIntParamList(1, NODI_PARAM_LIST_INT);
   if (params == nullptr) {
-    std::cerr << "Error, failed to create NODI parameter list." << std::endl;
-    std::exit(1);
+    throw Failure{1, "Error, failed to create NODI parameter list."};
   }
   // Setting the node is best effort: its status is not examined.
   NODI_Set(NODI_NODE_net_ens_activate, 0, params, 0, 0);
@@ -84,16 +81,14 @@ void SignalDeviceManager() {
   {
     std::ifstream in(kDeviceManagerPidFile);
     if (!in.is_open()) {
-      std::cout << "Failed to open " << kDeviceManagerPidFile << std::endl;
-      std::exit(1);
+      throw Failure{1, std::string("Failed to open ") + kDeviceManagerPidFile, true};
     }
     pid = ReadDecimal(in).value_or(0);
   }
   // 0 would signal our own process group; values at or above the limit name
   // no single process (and may turn negative as a pid_t).
   if (pid == 0 || pid >= PidLimit()) {
-    std::cout << "Failed to read device manager PID" << std::endl;
-    std::exit(1);
+    throw Failure{1, "Failed to read device manager PID", true};
   }
   // Fire and forget: the daemon is not waited for.
   kill(static_cast<pid_t>(pid), SIGHUP);

@@ -1,6 +1,5 @@
 // -a and -d on standard switches: creation with the default policies, and
 // removal after the admission check.
-#include <cstdlib>
 #include <iostream>
 
 #include "commands/commands.h"
@@ -34,8 +33,7 @@ void CheckDeleteAdmission(HostCtl::Network::VirtualSwitchInfo& info, const std::
                           bool dvswitch) {
   if (!TarnCtl::Network::PortsetImpl::IsValidVirtualSwitch(name) ||
       (!info.SwitchExists(name) && !dvswitch)) {
-    std::cerr << "Not a valid virtual switch or it is a DVSwitch: " << name << std::endl;
-    std::exit(1);
+    throw Failure{1, "Not a valid virtual switch or it is a DVSwitch: " + name};
   }
 }
 

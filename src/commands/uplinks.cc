@@ -1,7 +1,6 @@
 // -L, -U, -M and -N: uplinks of a standard switch and of its port groups,
 // and the two edits of a teaming policy's failover order they share.
 #include <algorithm>
-#include <cstdlib>
 #include <iostream>
 #include <memory>
 #include <vector>
@@ -88,42 +87,30 @@ int UnlinkPnic(HostCtl::Network::VirtualSwitch& sw, std::string pnic) {
   return 0;
 }
 
-void EditPortgroupUplinks(const std::string& switchName, const std::string& portGroup,
-                          const std::string& uplink, bool add) {
+void CheckKnownPortGroup(const std::string& portGroup) {
   if (!TarnCtl::Network::PortGroupImpl::IsValidPortGroup(portGroup)) {
-    std::cerr << "Unknown portgroup " << portGroup << std::endl;
-    std::exit(1);
+    throw Failure{1, "Unknown portgroup " + portGroup};
   }
+}
 
-  std::vector<std::string> switchUplinks;
-  std::vector<std::unique_ptr<HostCtl::Network::PortGroup>> groups;
-  try {
-    auto sw = HostCtl::Network::NetworkFactory::GetVirtualSwitchById(
-        switchName, static_cast<HostCtl::Network::PortsetGetType>(0));
-    switchUplinks = sw->GetUplinks();
-    groups = sw->GetPortGroups();
-  } catch (const HostCtlException& e) {
-    std::cerr << e.GetMessage() << std::endl;
-    std::exit(1);
-  }
+void EditPortgroupUplinks(HostCtl::Network::VirtualSwitch& sw, const std::string& switchName,
+                          const std::string& portGroup, const std::string& uplink, bool add) {
+  const std::vector<std::string> switchUplinks = OrEndWithMessage([&] { return sw.GetUplinks(); });
+  auto groups = OrEndWithMessage([&] { return sw.GetPortGroups(); });
 
   const bool onSwitch = std::any_of(groups.begin(), groups.end(), [&](const auto& group) {
     return group->GetName() == portGroup;
   });
   groups.clear();
   if (!onSwitch) {
-    std::cerr << "Portgroup (" << portGroup << ") does not exist on switch: " << switchName
-              << std::endl;
-    std::exit(1);
+    throw Failure{1, "Portgroup (" + portGroup + ") does not exist on switch: " + switchName};
   }
 
   TarnCtl::Network::PortGroupImpl group(portGroup);
   NicTeamingPolicy policy = group.GetTeamingPolicy();
   if (add) {
     if (std::find(switchUplinks.begin(), switchUplinks.end(), uplink) == switchUplinks.end()) {
-      std::cerr << "Uplink (" << uplink << ") does not exist on the switch: " << switchName
-                << std::endl;
-      std::exit(1);
+      throw Failure{1, "Uplink (" + uplink + ") does not exist on the switch: " + switchName};
     }
     AddUplinkToTeaming(uplink, policy);
   } else {
