@@ -15,7 +15,7 @@
 
 #include "cli/usage.h"
 #include "hostctl/network.h"
-#include "listing/text.h"
+#include "hostctl/uuid_text.h"
 
 namespace Cli {
 
@@ -82,9 +82,9 @@ void ConvertLagId(CommandOptions& options, const char* argument) {
 }
 
 void CheckUuid(CommandOptions&, const char* argument) {
-  if (HostCtl::Misc::IsValidUuidString(argument)) return;
+  if (HostCtl::Text::IsValidUuidString(argument)) return;
   std::cerr << "Invalid UUID:" << argument << ". Should be of format "
-            << HostCtl::Misc::UuidToString(kUuidFormatSample) << std::endl;
+            << HostCtl::Text::UuidToString(kUuidFormatSample) << std::endl;
   std::exit(1);
 }
 

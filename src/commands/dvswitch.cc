@@ -9,7 +9,7 @@
 
 #include "commands/commands.h"
 #include "hostctl/tarnctl.h"
-#include "listing/text.h"
+#include "hostctl/uuid_text.h"
 
 namespace Commands {
 namespace {
@@ -77,7 +77,7 @@ int CreateDVSwitch(HostCtl::Network::VirtualSwitchInfo& info, const Cli::Command
   // UuidToString hands out a shared buffer: keep our own copy of it.
   const std::string uuid =
       options.uuidText.empty()
-          ? std::string(HostCtl::Misc::UuidToString(options.switchName.c_str()))
+          ? std::string(HostCtl::Text::UuidToString(options.switchName.c_str()))
           : options.uuidText;
   const Implementation impl = ChooseImplementation(options);
   CheckBacking(impl);

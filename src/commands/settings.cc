@@ -1,30 +1,15 @@
 // -X, -x, -B and -b: the active uplink count and the discovery protocol
 // status of a standard switch.
-#include <array>
 #include <iostream>
 
 #include "commands/commands.h"
+#include "hostctl/cdp_words.h"
 #include "hostctl/exception.h"
 #include "hostctl/tarnctl.h"
 
 namespace Commands {
 
 using HostCtl::Lib::HostCtlException;
-
-namespace {
-
-// Words of the discovery status values 0..3.
-const std::array<std::string, 4> CdpStatusNames = {"down", "listen", "advertise", "both"};
-
-// The word of a status; a value the table does not cover prints as its number.
-std::string CdpStatusWord(int32_t status) {
-  if (status >= 0 && static_cast<size_t>(status) < CdpStatusNames.size()) {
-    return CdpStatusNames[status];
-  }
-  return std::to_string(status);
-}
-
-}  // namespace
 
 int SetMaxActive(HostCtl::Network::VirtualSwitch& sw, int32_t count) {
   try {
@@ -55,7 +40,7 @@ int GetMaxActive(HostCtl::Network::VirtualSwitch& sw) {
 int SetOrPrintCdp(HostCtl::Network::VirtualSwitch& sw, std::string word) {
   try {
     if (word == "print") {
-      std::cout << CdpStatusWord(sw.GetCdpStatus()) << std::endl;
+      std::cout << HostCtl::Text::CdpWord(sw.GetCdpStatus()) << std::endl;
     } else {
       sw.SetCdpStatus(TarnCtl::Network::VirtualSwitchImpl::ParseCdpStatus(word));
     }

@@ -40,4 +40,19 @@ inline int ScanUuid(const char* text, int* consumed) {
                      consumed);
 }
 
+// UuidOfText in a buffer of its own, which the next call overwrites (for
+// callers that print C strings).
+inline const char* UuidToString(const char* text) {
+  static char buffer[48];
+  std::snprintf(buffer, sizeof buffer, "%s", UuidOfText(text).c_str());
+  return buffer;
+}
+
+// True when `text` scans as a UUID text (white space between bytes
+// optional, none before the "-", trailing text ignored).
+inline bool IsValidUuidString(const char* text) {
+  int consumed = 0;
+  return ScanUuid(text, &consumed) == kUuidBytes;
+}
+
 }  // namespace HostCtl::Text

@@ -1,5 +1,4 @@
-// Text helpers shared by the listing tables and the option checks: list
-// joining and the text form of a distributed switch UUID.
+// Text helpers of the listing tables: list joining.
 #pragma once
 
 #include <sstream>
@@ -20,14 +19,5 @@ std::string VectorToString(const std::vector<T>& items, const char* separator) {
   }
   return out.str();
 }
-
-// The UUID text of the first 15 bytes of `text`, zero-padded to 16: sixteen
-// two-digit hex bytes separated by spaces, with "-" after the eighth. The
-// result lives in a static buffer that the next call overwrites.
-const char* UuidToString(const char* text);
-
-// True when `text` scans as a UUID text (sscanf rules: white space between
-// bytes optional, none before the "-", trailing text ignored).
-bool IsValidUuidString(const char* text);
 
 }  // namespace HostCtl::Misc

@@ -4,13 +4,14 @@
 #include <string>
 #include <vector>
 
+#include "hostctl/uuid_text.h"
 #include "listing/text.h"
 
 namespace {
 
-using HostCtl::Misc::IsValidUuidString;
-using HostCtl::Misc::UuidToString;
 using HostCtl::Misc::VectorToString;
+using HostCtl::Text::IsValidUuidString;
+using HostCtl::Text::UuidToString;
 
 TEST(VectorToString, JoinsWithoutTrailingSeparator) {
   using Names = std::vector<std::string>;

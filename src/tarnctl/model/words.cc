@@ -30,11 +30,6 @@ int32_t CdpStatusOfWord(const std::string& word) {
                             "(expected " + Alternatives(kCdpWords) + ")");
 }
 
-std::string CdpWord(int64_t status) {
-  return status >= 0 && status < static_cast<int64_t>(kCdpWords.size()) ? kCdpWords[status]
-                                                                        : std::to_string(status);
-}
-
 bool IsUuidText(const std::string& text) {
   int consumed = 0;
   return HostCtl::Text::ScanUuid(text.c_str(), &consumed) == HostCtl::Text::kUuidBytes &&

@@ -6,15 +6,17 @@
 #include <cstdint>
 #include <string>
 
+#include "hostctl/cdp_words.h"
+
 namespace TarnCtl::Model {
 
 // CDP statuses 0 to 3 by their words.
-inline constexpr std::array<const char*, 4> kCdpWords = {"down", "listen", "advertise", "both"};
+using HostCtl::Text::kCdpWords;
 
 // The status a word names; refuses other words.
 int32_t CdpStatusOfWord(const std::string& word);
 // The word of a status; a status outside 0..3 as its number.
-std::string CdpWord(int64_t status);
+using HostCtl::Text::CdpWord;
 
 // Refuses text that is not exactly a UUID text (hostctl/uuid_text.h).
 void CheckUuid(const std::string& text);
