@@ -57,4 +57,4 @@ JSON: the layers by name, words for codes, texts that are not UTF-8 in hex.
   $ tarnhost show --json pg3 | jq -c '.portGroup.running | .teaming | {uplinkOrderSet, uplinkOrder, maxActive}'
   {"uplinkOrderSet":true,"uplinkOrder":["pnic2"],"maxActive":1}
   $ tarnhost fault add GetName --message $'bad\xff' && tarnhost show --json | jq -c '.faults'
-  [{"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1}]
+  [{"number":1,"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1,"delayMs":0,"pass":false,"always":false,"fired":0,"state":"armed"}]
