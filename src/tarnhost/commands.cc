@@ -446,6 +446,10 @@ int AddFault(const Args& args) {
   seed.detail = args.Value("detail");
   if (auto v = args.Value("skip")) seed.skip = ParseInt64(*v, "--skip");
   if (auto v = args.Value("times")) seed.times = ParseInt64(*v, "--times");
+  if (auto v = args.Value("delay")) seed.delayMs = ParseInt64(*v, "--delay");
+  seed.pass = args.Has("pass");
+  seed.always = args.Has("always");
+  if (seed.always && args.Has("times")) throw UsageError("--always and --times exclude each other");
   return OnHost([&](Db& db) { Admin::AddFault(db, seed); });
 }
 
@@ -495,6 +499,7 @@ int RemoveFault(const Args& args) {
 }
 
 int PrintList(Listing what, const Args& args) {
+  if (what == Listing::kFaults && args.Has("armed")) what = Listing::kArmedFaults;
   const auto rows = OnHost([&](Db& db) { return Admin::List(db, what); });
   const std::string* only = args.Positionals().empty() ? nullptr : &args.Positional(0);
   std::string text;

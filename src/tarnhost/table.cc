@@ -307,12 +307,21 @@ const std::vector<Command>& Commands() {
                               {.name = "times",
                                .value = "N",
                                .help = "fail N calls (default 1)",
-                               .kind = Kind::Number}}},
+                               .kind = Kind::Number},
+                              {.name = "always", .help = "fail every matching call, not N"},
+                              {.name = "delay",
+                               .value = "MS",
+                               .help = "wait MS milliseconds before the call fails (default 0)",
+                               .kind = Kind::Number},
+                              {.name = "pass",
+                               .help = "let the call go on normally after the wait: a slow "
+                                       "host"}}},
        .summary = "make a library operation fail",
        .help = "OPERATION is named as in the host control interface (SetVlanId, AddUplink, ...); "
                "its next matching calls throw. NODI_CheckSig fails by returning a non-zero "
                "status and GetIntParamList by returning no list. Faults are used up across "
-               "runs; 'tarnhost fault list' lists those still armed.",
+               "runs; one used up stays listed as spent, with the calls it fired on, until it "
+               "is removed.",
        .run = AddFault},
       {.words = {"fault", "del"},
        .syntax = {.arguments = {{"NUMBER", Kind::Fault}}},
@@ -320,10 +329,13 @@ const std::vector<Command>& Commands() {
        .help = "NUMBER is the one 'tarnhost fault list' shows; a fault keeps it while armed.",
        .run = RemoveFault},
       {.words = {"fault", "list"},
-       .summary = "list the armed faults",
+       .syntax = {.options = {{.name = "armed", .help = "only the faults not spent"}}},
+       .summary = "list the faults",
        .help = "A line for each, in the order they are tried: its number, operation, the object "
                "of --on, the calls still to let pass and to fail, the message and the detailed "
-               "message (quoted and escaped as in the call trace)." LIST_FORM,
+               "message (quoted and escaped as in the call trace), the delay in ms, pass when "
+               "the call goes on after it, always when every call fails, the calls it fired on, "
+               "and armed or spent." LIST_FORM,
        .run = List<Listing::kFaults>},
       {.words = {"fault", "clear"}, .summary = "remove every armed fault", .run = ClearFaults},
       {.words = {"fault", "ops"},

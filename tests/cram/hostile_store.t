@@ -95,6 +95,20 @@ directory only root writes), and a change to it says why it cannot be made:
   host.db
   host.db-wal
 
+A host of schema version 1 (faults without delays and counts) is read through
+a view by a user who cannot write it, and brought to version 2 by the first
+program that can:
+
+  $ sqlite3 ro/host.db "ALTER TABLE fault DROP COLUMN delay_ms; ALTER TABLE fault DROP COLUMN pass;
+  >   ALTER TABLE fault DROP COLUMN always; ALTER TABLE fault DROP COLUMN fired; PRAGMA user_version=1;
+  >   INSERT INTO fault(operation, message, detail, skip, times) VALUES ('GetName', 'm', 'd', 0, 2)"
+  $ as tarnhost fault list | tr '\t' '|'; sqlite3 ro/host.db 'PRAGMA user_version'
+  1|GetName||0|2|"m"|"d"|0|||0|armed
+  1
+  $ tarnhost fault list | tr '\t' '|'; sqlite3 ro/host.db 'PRAGMA user_version'
+  1|GetName||0|2|"m"|"d"|0|||0|armed
+  2
+
 A creation is all or nothing: the new host is built beside the file and
 renamed into place, so a file that a killed creation left is no host yet and
 is made again; a log beside a missing file is another host's, and is kept:

@@ -76,4 +76,4 @@ offers exactly the names show takes.
   dvs0:100
   dvs0:101
   $ tarnhost fault add GetName --message $'bad\xff' && tarnhost show --json | jq -c '.faults'
-  [{"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1}]
+  [{"number":1,"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1,"delayMs":0,"pass":false,"always":false,"fired":0,"state":"armed"}]

@@ -51,7 +51,7 @@ lines are not wrapped.
         1 80:  A line for each of the running state: its name, ports, used ports and uplinks.
         1 80:  orvocfg-vswitch -G loads the matching records. The timeout is 0 to 255 and the
         1 80:  orvocfg-vswitch -O loads the matching records. The timeout is 0 to 255 and the
-        3 80:  separated by a tab and lists within a field by commas; an empty field is none.
+        2 80:  separated by a tab and lists within a field by commas; an empty field is none.
         1 80:  used ports and uplinks. Fields are separated by a tab and lists within a field
   $ tarnhost --version
   tarnhost \d+\.\d+\.\d+ (re)
@@ -82,6 +82,9 @@ of the command, or a hint where none is known, on standard error; status 2.
   > dvs add d1 --uplinks pnic1,,pnic2
   > dvs add d1 --mtu
   > fault add GetName --skip ' 1'
+  > fault add GetName --delay -5
+  > fault add GetName --delay 1s
+  > fault add GetName --always --times 2
   > show --dot Management
   > show --json --dot
   > EOF
@@ -91,7 +94,7 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: missing verb after pnic (add, del, list)|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
   2 tarnhost: missing word after timeout add (uplink, lag)|usage: tarnhost timeout add uplink ...|       tarnhost timeout add lag ...
   2 tarnhost: unknown command: pnic remove|usage: tarnhost pnic add ...|       tarnhost pnic del ...|       tarnhost pnic list
-  2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault del ...|       tarnhost fault list|       tarnhost fault clear|       tarnhost fault ops
+  2 tarnhost: unknown command: fault ad; did you mean fault add?|usage: tarnhost fault add ...|       tarnhost fault del ...|       tarnhost fault list ...|       tarnhost fault clear|       tarnhost fault ops
   2 tarnhost: missing NAME|usage: tarnhost pnic add ...
   2 tarnhost: option --empty takes no value|usage: tarnhost init ...
   2 tarnhost: unknown option --full for init|usage: tarnhost init ...
@@ -105,6 +108,9 @@ of the command, or a hint where none is known, on standard error; status 2.
   2 tarnhost: empty name in --uplinks|usage: tarnhost dvs add ...
   2 tarnhost: option --mtu needs a value|usage: tarnhost dvs add ...
   2 tarnhost: bad number for --skip: " 1"|usage: tarnhost fault add ...
+  2 tarnhost: bad number for --delay: "-5"|usage: tarnhost fault add ...
+  2 tarnhost: bad number for --delay: "1s"|usage: tarnhost fault add ...
+  2 tarnhost: --always and --times exclude each other|usage: tarnhost fault add ...
   2 tarnhost: NAME is shown as text or with --json, not as a graph|usage: tarnhost show ...
   2 tarnhost: --json and --dot exclude each other|usage: tarnhost show ...
   $ ls
@@ -115,7 +121,7 @@ exactly, the commands and options of the table as the usage shows it, and
 the operations as `fault ops` lists them.
 
   $ python3 "$TESTDIR/tarnhost_table.py" "$TESTDIR/../.."
-  42 commands, 24 options, 71 operations compared
+  42 commands, 28 options, 71 operations compared
 
 The default host as a dump; refusals of the host: "tarnhost: " and the
 reason with its explanation, status 1, nothing changed (each refusal's
@@ -190,7 +196,7 @@ Seeding shows up, and a dump brings it all back.
   opq0|opq0|128|3|pnic3
   uplink|vswitch0|pnic0|1|5
   lag|ps0||2|255
-  1|SetVlanId|pg2|1|1|"boom"|"injected fault in SetVlanId"
+  1|SetVlanId|pg2|1|1|"boom"|"injected fault in SetVlanId"|0|||0|armed
   $ tarnhost fault ops | grep -E '^(SetVlanId|TARN_ReturnStatusToString)\s' | tr '\t' '|'
   SetVlanId|yes|a port group
   TARN_ReturnStatusToString|no|nothing (any call)
@@ -344,3 +350,45 @@ line that overwrites itself, ended by a newline; nothing otherwise.
   tarnhost: load 4096 rows
   tarnhost: dump 4096 of 5002 rows (81%)
   tarnhost: dump 5002 of 5002 rows (100%)
+
+Faults that fail every call, slow calls down, or fail after a wait; each
+counts the calls it fired on, and one used up stays listed as spent until
+it is removed. A dump made before faults had those fields loads with none.
+
+  $ tarnhost init && tarnhost fault add SetVlanId --on Management --always --message stuck
+  $ tarnhost fault add SetVlanId --delay 20 --pass && tarnhost fault add AddPortGroup --delay 20
+  $ for args in '-v 5 -p Management vswitch0' '-v 6 -p Management vswitch0' '-A pg1 vswitch0' \
+  >   '-A pg1 vswitch0' '-v 7 -p pg1 vswitch0'; do orvocfg-vswitch $args; echo "$args: $?"; done
+  Set vlan id to 5 failed for Management, Error: stuck
+  -v 5 -p Management vswitch0: 1
+  Set vlan id to 6 failed for Management, Error: stuck
+  -v 6 -p Management vswitch0: 1
+  Failed to add portgroup: pg1 to vswitch: vswitch0, Error: injected fault
+  -A pg1 vswitch0: 1
+  -A pg1 vswitch0: 0
+  -v 7 -p pg1 vswitch0: 0
+  $ orvocfg-vswitch -l | grep -c pg1; tarnhost show --json pg1 | jq -c '.portGroup | map_values(.vlan)'
+  1
+  {"running":7,"stored":7}
+  $ tarnhost fault list | cut -f1,2,5,8- | tr '\t' '|'; tarnhost fault list --armed | cut -f1 | paste -sd' '
+  1|SetVlanId|1|0||always|2|armed
+  2|SetVlanId|0|20|pass||1|spent
+  3|AddPortGroup|0|20|||1|spent
+  1
+  $ tarnhost show --json | jq -c '.faults[] | [.number, .fired, .state]'
+  [1,2,"armed"]
+  [2,1,"spent"]
+  [3,1,"spent"]
+  $ tarnhost show | sed -n '/^Faults/,$p'
+  Faults
+    SetVlanId on Management: lets 0 pass, then fails every call; message "stuck", detail "injected fault in SetVlanId"; fired 2
+    SetVlanId: lets 0 pass, then slows 0 by 20 ms; message "injected fault", detail "injected fault in SetVlanId"; fired 1; spent
+    AddPortGroup: lets 0 pass, then fails 0 by 20 ms; message "injected fault", detail "injected fault in AddPortGroup"; fired 1; spent
+  $ tarnhost fault del 3 && tarnhost fault list | cut -f1 | paste -sd' '
+  1 2
+  $ tarnhost dump | jq '.tables.fault |= map(del(.delay_ms, .pass, .always, .fired))' | tarnhost load -
+  $ tarnhost fault list | cut -f1,5,8- | tr '\t' '|'
+  1|1|0|||0|armed
+  2|0|0|||0|spent
+  $ tarnhost fault clear && tarnhost fault list | wc -l
+  0

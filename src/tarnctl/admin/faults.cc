@@ -1,5 +1,7 @@
 #include "tarnctl/admin/faults.h"
 
+#include <type_traits>
+
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/instrument/operations.h"
@@ -18,6 +20,12 @@ std::string Quoted(const std::string& text) {
   std::string quoted;
   Instrument::AppendArg(quoted, text);
   return quoted;
+}
+
+// What a fault does now: "armed", or "spent" once it has done all it was
+// armed for.
+const char* State(const Fault& fault) {
+  return Store::Faults::Spent(fault) ? "spent" : "armed";
 }
 
 }  // namespace
@@ -51,11 +59,12 @@ void AddFault(Store::Db& db, const FaultSeed& seed) {
   if (seed.on) Model::CheckName(Model::NameKind::kFaultTarget, *seed.on);
   Model::Check(Model::kFaultSkip, seed.skip);
   Model::Check(Model::kFaultTimes, seed.times);
+  Model::Check(Model::kFaultDelay, seed.delayMs);
   Store::Transaction transaction(db);
   Store::Faults::Insert(
-      db,
-      {0, seed.operation, seed.on, seed.message.value_or(Store::Faults::kDefaultMessage),
-       seed.detail.value_or(Store::Faults::DefaultDetail(seed.operation)), seed.skip, seed.times});
+      db, {0, seed.operation, seed.on, seed.message.value_or(Store::Faults::kDefaultMessage),
+           seed.detail.value_or(Store::Faults::DefaultDetail(seed.operation)), seed.skip,
+           seed.times, seed.delayMs, seed.pass, seed.always, 0});
   transaction.Commit();
 }
 
@@ -76,29 +85,56 @@ void ClearFaults(Store::Db& db) {
   transaction.Commit();
 }
 
-std::vector<ListRow> ListFaults(Store::Db& db) {
+std::vector<ListRow> ListFaults(Store::Db& db, bool armedOnly) {
   std::vector<ListRow> rows;
   for (const auto& fault : Faults(db)) {
-    rows.push_back({std::to_string(fault.id), fault.operation, fault.target.value_or(""),
-                    std::to_string(fault.skip), std::to_string(fault.times), Quoted(fault.message),
-                    Quoted(fault.detail)});
+    if (armedOnly && Store::Faults::Spent(fault)) continue;
+    ListRow row(Store::Faults::kFieldCount);
+    Store::Faults::VisitFields(fault, [&](const Store::Faults::Field& field, const auto& value) {
+      using T = std::remove_cvref_t<decltype(value)>;
+      std::string& text = row[field.listed];
+      if constexpr (std::is_same_v<T, bool>) {
+        text = value ? field.key : "";
+      } else if constexpr (std::is_same_v<T, std::string>) {
+        text = field.value == Store::Faults::Value::kText ? Quoted(value) : value;
+      } else if constexpr (std::is_same_v<T, std::optional<std::string>>) {
+        text = value.value_or("");
+      } else {
+        text = std::to_string(value);
+      }
+    });
+    row.push_back(State(fault));
+    rows.push_back(std::move(row));
   }
   return rows;
 }
 
 std::string FaultText(const Fault& fault) {
-  return fault.operation + (fault.target ? " on " + *fault.target : "") + ": lets " +
-         std::to_string(fault.skip) + " pass, then fails " + std::to_string(fault.times) +
-         "; message " + Quoted(fault.message) + ", detail " + Quoted(fault.detail);
+  std::string text = fault.operation + (fault.target ? " on " + *fault.target : "") + ": lets " +
+                     std::to_string(fault.skip) + " pass, then " +
+                     (fault.pass ? "slows " : "fails ") +
+                     (fault.always ? "every call" : std::to_string(fault.times));
+  if (fault.delayMs > 0) text += " by " + std::to_string(fault.delayMs) + " ms";
+  text += "; message " + Quoted(fault.message) + ", detail " + Quoted(fault.detail);
+  if (fault.fired > 0) text += "; fired " + std::to_string(fault.fired);
+  if (Store::Faults::Spent(fault)) text += "; spent";
+  return text;
 }
 
 Json FaultJson(const Fault& fault) {
-  return {{"operation", fault.operation},
-          {"on", fault.target ? TextJson(*fault.target) : Json(nullptr)},
-          {"message", TextJson(fault.message)},
-          {"detail", TextJson(fault.detail)},
-          {"skip", fault.skip},
-          {"times", fault.times}};
+  Json json = Json::object();
+  Store::Faults::VisitFields(fault, [&](const Store::Faults::Field& field, const auto& value) {
+    using T = std::remove_cvref_t<decltype(value)>;
+    if constexpr (std::is_same_v<T, std::string>) {
+      json[field.key] = TextJson(value);
+    } else if constexpr (std::is_same_v<T, std::optional<std::string>>) {
+      json[field.key] = value ? TextJson(*value) : Json(nullptr);
+    } else {
+      json[field.key] = value;
+    }
+  });
+  json["state"] = State(fault);
+  return json;
 }
 
 }  // namespace TarnCtl::Admin

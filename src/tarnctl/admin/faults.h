@@ -23,6 +23,9 @@ struct FaultSeed {
   std::optional<std::string> detail;
   int64_t skip = 0;
   int64_t times = 1;
+  int64_t delayMs = 0;
+  bool pass = false;
+  bool always = false;
 };
 
 // An operation of the host control library, for arming faults.
@@ -42,8 +45,10 @@ void AddFault(Store::Db& db, const FaultSeed& seed);
 void RemoveFault(Store::Db& db, int64_t number);
 void ClearFaults(Store::Db& db);
 
-// Number, operation, object, skip, times, message, detail (quoted).
-std::vector<ListRow> ListFaults(Store::Db& db);
+// Number, operation, object, skip, times, message, detail (quoted), delay
+// (ms), pass, always, fired, and armed or spent; `armedOnly`: without the
+// spent ones.
+std::vector<ListRow> ListFaults(Store::Db& db, bool armedOnly = false);
 
 std::string FaultText(const Fault& fault);
 Json FaultJson(const Fault& fault);

@@ -38,6 +38,8 @@ std::vector<ListRow> List(Store::Db& db, Listing what) {
       return ListTimeouts(db);
     case Listing::kFaults:
       return ListFaults(db);
+    case Listing::kArmedFaults:
+      return ListFaults(db, true);
   }
   return {};
 }

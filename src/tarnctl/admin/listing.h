@@ -24,6 +24,7 @@ enum class Listing {
   kDVPorts,
   kTimeouts,
   kFaults,
+  kArmedFaults,  // without the spent ones
 };
 // The objects of a list, in the order they were made.
 std::vector<ListRow> List(Store::Db& db, Listing what);

@@ -54,8 +54,8 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   try {
     // A fault is used up even when it makes the operation fail: it is taken
     // before the savepoint that a failure undoes.
-    if (auto fault = TakeFault(*db_, g_running, target.names)) {
-      if (onFault == OnFault::kThrow) throw *fault;
+    if (auto fired = TakeFault(*db_, g_running, target.names); fired && fired->failure) {
+      if (onFault == OnFault::kThrow) throw *fired->failure;
       failed_ = true;
     }
     if (operation.access == kChanges) savepoint_.emplace(*db_);

@@ -1,6 +1,8 @@
 #include "tarnctl/instrument/faults.h"
 
 #include <algorithm>
+#include <chrono>
+#include <thread>
 
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/db.h"
@@ -30,7 +32,7 @@ std::vector<Store::Faults::Row>& Rows(Store::Db& db) {
 
 bool Matches(const Store::Faults::Row& row, const char* operation,
              std::span<const std::string_view> names) {
-  if (row.operation != operation || (row.skip <= 0 && row.times <= 0)) return false;
+  if (row.operation != operation || Store::Faults::Spent(row)) return false;
   if (!row.target) return true;
   for (const std::string_view name : names) {
     if (!name.empty() && name == *row.target) return true;
@@ -40,8 +42,8 @@ bool Matches(const Store::Faults::Row& row, const char* operation,
 
 }  // namespace
 
-std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
-                                 std::span<const std::string_view> names) {
+std::optional<Fired> TakeFault(Store::Db& db, const char* operation,
+                               std::span<const std::string_view> names) {
   const auto& rows = Rows(db);
   if (rows.empty()) return std::nullopt;
   const auto row = std::find_if(rows.begin(), rows.end(), [&](const auto& candidate) {
@@ -50,23 +52,25 @@ std::optional<Refusal> TakeFault(Store::Db& db, const char* operation,
   if (row == rows.end()) return std::nullopt;
 
   const Store::Faults::Row fault = *row;
-  const bool fails = fault.skip <= 0;
+  const bool fires = fault.skip <= 0;
   {
     Store::Transaction transaction(db);
-    if (fails) {
-      Store::Faults::UseTime(db, fault.id);
+    if (fires) {
+      Store::Faults::Fire(db, fault.id);
     } else {
       Store::Faults::UseSkip(db, fault.id);
     }
     transaction.Commit();
   }
-  if (!fails) return std::nullopt;
+  if (!fires) return std::nullopt;
+  if (fault.delayMs > 0) std::this_thread::sleep_for(std::chrono::milliseconds(fault.delayMs));
+  if (fault.pass) return Fired{fault.id, std::nullopt};
   const std::string message =
       fault.message.empty() ? std::string(Store::Faults::kDefaultMessage) : fault.message;
   // A detail of the fault's own is the whole detailed message: no
   // operation's name leads it.
-  if (!fault.detail.empty()) return Refusal("", message, fault.detail);
-  return Refusal(operation, message, message);
+  if (!fault.detail.empty()) return Fired{fault.id, Refusal("", message, fault.detail)};
+  return Fired{fault.id, Refusal(operation, message, message)};
 }
 
 }  // namespace TarnCtl::Instrument

@@ -38,6 +38,12 @@ inline constexpr Range kTimeout{"Invalid timeout {}", 0, 255};
 // Armed faults: calls to let pass first, calls to fail.
 inline constexpr Range kFaultSkip{"Invalid skip count {}", 0, kInt32Max, "(it must be 0 or more)"};
 inline constexpr Range kFaultTimes{"Invalid times {}", 1, kInt32Max, "(it must be 1 or more)"};
+// A fault's calls still to fail once armed (0: spent), its delay in
+// milliseconds and the calls it fired on.
+inline constexpr Range kFaultTimesLeft{"Invalid times {}", 0, kInt32Max, "(it must be 0 or more)"};
+inline constexpr Range kFaultDelay{"Invalid delay {} ms", 0, kInt32Max, "(it must be 0 or more)"};
+inline constexpr Range kFaultFired{"Invalid fired count {}", 0, kInt32Max,
+                                   "(it must be 0 or more)"};
 // Values of the ordering counter (and so of every seq), with room to grow.
 inline constexpr Range kSeq{"Invalid sequence number {}", 1, int64_t{1} << 53};
 

@@ -1,38 +1,74 @@
 #include "tarnctl/store/faults.h"
 
+#include <type_traits>
+
 #include "tarnctl/store/db.h"
 
 namespace TarnCtl::Store::Faults {
 
+namespace {
+
+// The table's columns from the one description, as "a, b, c".
+std::string Columns(bool withId) {
+  const Row none;
+  std::string columns;
+  VisitFields(none, [&](const Field& field, const auto&) {
+    if (!withId && field.value == Value::kId) return;
+    if (!columns.empty()) columns += ", ";
+    columns += field.column;
+  });
+  return columns;
+}
+
+}  // namespace
+
 std::vector<Row> List(Db& db) {
+  static const std::string sql = "SELECT " + Columns(true) + " FROM fault ORDER BY id";
   std::vector<Row> rows;
-  auto select = db.Prepare(
-      "SELECT id, operation, target, message, detail, skip, times FROM fault ORDER BY id");
+  auto select = db.Prepare(sql);
   while (select.Step()) {
     Row row;
-    row.id = select.Int(0);
-    row.operation = select.Text(1);
-    if (!select.IsNull(2)) row.target = select.Text(2);
-    row.message = select.Text(3);
-    row.detail = select.Text(4);
-    row.skip = select.Int(5);
-    row.times = select.Int(6);
+    int column = 0;
+    VisitFields(row, [&](const Field&, auto& member) {
+      using T = std::remove_reference_t<decltype(member)>;
+      if constexpr (std::is_same_v<T, std::string>) {
+        member = select.Text(column);
+      } else if constexpr (std::is_same_v<T, std::optional<std::string>>) {
+        if (!select.IsNull(column)) member = select.Text(column);
+      } else {
+        member = static_cast<T>(select.Int(column));
+      }
+      ++column;
+    });
     rows.push_back(std::move(row));
   }
   return rows;
 }
 
 int64_t Insert(Db& db, const Row& row) {
-  auto insert = db.Prepare(
-      "INSERT INTO fault(operation, target, message, detail, skip, times)"
-      " VALUES (?, ?, ?, ?, ?, ?) RETURNING id");
-  insert.Bind(1, row.operation);
-  if (row.target) {
-    insert.Bind(2, *row.target);
-  } else {
-    insert.BindNull(2);
-  }
-  insert.Bind(3, row.message).Bind(4, row.detail).Bind(5, row.skip).Bind(6, row.times);
+  static const std::string sql = [] {
+    std::string places;
+    for (int i = 1; i < kFieldCount; ++i) places += i > 1 ? ", ?" : "?";
+    return "INSERT INTO fault(" + Columns(false) + ") VALUES (" + places + ") RETURNING id";
+  }();
+  auto insert = db.Prepare(sql);
+  int place = 0;
+  VisitFields(row, [&](const Field& field, const auto& member) {
+    using T = std::remove_cvref_t<decltype(member)>;
+    if (field.value == Value::kId) return;
+    ++place;
+    if constexpr (std::is_same_v<T, std::string>) {
+      insert.Bind(place, member);
+    } else if constexpr (std::is_same_v<T, std::optional<std::string>>) {
+      if (member) {
+        insert.Bind(place, *member);
+      } else {
+        insert.BindNull(place);
+      }
+    } else {
+      insert.Bind(place, static_cast<int64_t>(member));
+    }
+  });
   insert.Step();
   const int64_t id = insert.Int(0);
   insert.Run();
@@ -43,9 +79,12 @@ void UseSkip(Db& db, int64_t id) {
   db.Prepare("UPDATE fault SET skip = skip - 1 WHERE id = ?").Bind(1, id).Run();
 }
 
-void UseTime(Db& db, int64_t id) {
-  db.Prepare("UPDATE fault SET times = times - 1 WHERE id = ?").Bind(1, id).Run();
-  db.Prepare("DELETE FROM fault WHERE id = ? AND times <= 0").Bind(1, id).Run();
+void Fire(Db& db, int64_t id) {
+  db.Prepare(
+        "UPDATE fault SET fired = fired + 1, times = times - (always = 0 AND times > 0)"
+        " WHERE id = ?")
+      .Bind(1, id)
+      .Run();
 }
 
 bool Delete(Db& db, int64_t id) {

@@ -426,6 +426,29 @@ bool HalfMade(Db& db, const std::string& path) {
   }
 }
 
+// Brings a host of an older schema version to this one: in place when
+// this process can write it, else through a view for reading.
+void Upgrade(Db& db, const std::string& real, const std::string& path) {
+  try {
+    int64_t version = 0;
+    {
+      auto statement = db.Prepare("PRAGMA user_version");
+      if (statement.Step()) version = statement.Int(0);
+    }
+    if (version >= kSchemaVersion) return;
+    if (!Writable(real)) {
+      db.Exec(kFaultViewOfVersion1);
+      return;
+    }
+    Transaction transaction(db);
+    db.Exec(std::string(kFaultColumnsSince2) +
+            "PRAGMA user_version=" + std::to_string(kSchemaVersion));
+    transaction.Commit();
+  } catch (const DbFailure& failure) {
+    throw CannotOpen(path, failure);
+  }
+}
+
 }  // namespace
 
 std::string WaitingLog(const std::string& path) {
@@ -488,7 +511,11 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
       if (header != Header::kEmpty) {
         db = Connect(real, path, header);
         halfMade = HalfMade(*db, path);
-        if (halfMade) db.reset();
+        if (halfMade) {
+          db.reset();
+        } else {
+          Upgrade(*db, real, path);
+        }
       }
       bool created = false;
       if (!db) {

@@ -37,7 +37,21 @@ CREATE TABLE uplink_timeout(layer, portset, uplink, lag_id, timeout,
   PRIMARY KEY(layer, portset, uplink, lag_id)) WITHOUT ROWID;
 CREATE TABLE lag_timeout(layer, portset, lag_id, timeout, PRIMARY KEY(layer, portset, lag_id))
   WITHOUT ROWID;
-CREATE TABLE fault(id INTEGER PRIMARY KEY, operation, target, message, detail, skip, times);
+CREATE TABLE fault(id INTEGER PRIMARY KEY, operation, target, message, detail, skip, times,
+  delay_ms, pass, always, fired);
+)sql";
+
+// Version 1 had no delays, flags or counts of its faults.
+const char* const kFaultColumnsSince2 = R"sql(
+ALTER TABLE fault ADD COLUMN delay_ms DEFAULT 0;
+ALTER TABLE fault ADD COLUMN pass DEFAULT 0;
+ALTER TABLE fault ADD COLUMN always DEFAULT 0;
+ALTER TABLE fault ADD COLUMN fired DEFAULT 0;
+)sql";
+
+const char* const kFaultViewOfVersion1 = R"sql(
+CREATE TEMP VIEW fault AS SELECT id, operation, target, message, detail, skip, times,
+  0 AS delay_ms, 0 AS pass, 0 AS always, 0 AS fired FROM main.fault;
 )sql";
 
 }  // namespace TarnCtl::Store

@@ -43,7 +43,14 @@
 //  fault                     armed failures: the operation's name, the
 //                             object name it is restricted to (NULL: any),
 //                             message and detailed message, calls to let
-//                             pass first, calls still to fail.
+//                             pass first, calls still to fail, the wait
+//                             before a call fails or goes on (ms), whether
+//                             it goes on (pass) after the wait, whether
+//                             every call fails (always), calls it fired on.
+//
+// Versions: 2 added the fault's delay_ms, pass, always and fired. A host
+// of version 1 is brought to version 2 when it is opened for writing, and
+// read through a view that adds those columns when it is only read.
 #pragma once
 
 #include <cstdint>
@@ -51,9 +58,14 @@
 namespace TarnCtl::Store {
 
 constexpr int32_t kApplicationId = 0x54524e48;  // "TRNH"
-constexpr int kSchemaVersion = 1;
+constexpr int kSchemaVersion = 2;
 
 // Creates every table of an empty database (run inside a transaction).
 extern const char* const kSchemaSql;
+// Brings a version 1 host to version 2 (run inside a transaction).
+extern const char* const kFaultColumnsSince2;
+// For a version 1 host that is only read: a temporary view over its faults
+// with the columns of version 2.
+extern const char* const kFaultViewOfVersion1;
 
 }  // namespace TarnCtl::Store

@@ -193,8 +193,8 @@ TEST_F(AdminTest, RemovalUndoesSeeding) {
   AddFault(host.db(), {"GetName", {}, "a\tb", {}, 0, 1});
   RemoveFault(host.db(), 1);
   EXPECT_EQ(List(host.db(), Listing::kFaults),
-            (std::vector<ListRow>{
-                {"2", "GetName", "", "0", "1", "\"a\\tb\"", "\"injected fault in GetName\""}}));
+            (std::vector<ListRow>{{"2", "GetName", "", "0", "1", "\"a\\tb\"",
+                                   "\"injected fault in GetName\"", "0", "", "", "0", "armed"}}));
   RemoveFault(host.db(), 2);
   RemoveOpaqueSwitch(host.db(), "opq0");
   RemovePnic(host.db(), "pnic4");

@@ -28,17 +28,31 @@ std::string Outcome(const std::function<void()>& call) {
 TEST_F(FaultTest, SkipAndTimesCountDown) {
   struct Case {
     int64_t skip, times;
+    bool always, pass;
     const char* outcomes;
+    int64_t fired;
   };
   const std::vector<Case> cases = {
-      {0, 1, "FPPPP"}, {1, 2, "PFFPP"}, {3, 1, "PPPFP"}, {0, 4, "FFFFP"}};
+      {0, 1, false, false, "FPPPP", 1}, {1, 2, false, false, "PFFPP", 2},
+      {3, 1, false, false, "PPPFP", 1}, {0, 4, false, false, "FFFFP", 4},
+      {1, 1, true, false, "PFFFF", 4},  {0, 2, false, true, "PPPPP", 2}};
   NetworkInfoImpl network;
   PortGroupImpl pg("Management");
   for (const Case& c : cases) {
-    Arm(Fault("SetVlanId", std::nullopt, c.skip, c.times));
+    TarnCtl::Admin::ClearFaults(TarnCtl::Admin::Host().db());
+    FaultSeed seed = Fault("SetVlanId", std::nullopt, c.skip, c.times);
+    seed.always = c.always;
+    seed.pass = c.pass;
+    seed.delayMs = c.pass ? 1 : 0;
+    Arm(seed);
     std::string outcomes;
     for (int i = 0; i < 5; ++i) outcomes += Outcome([&] { pg.SetVlanId(7); });
     EXPECT_EQ(outcomes, c.outcomes) << "skip " << c.skip << " times " << c.times;
+    // A used-up fault stays, spent, with the count of calls it fired on.
+    const auto faults = TarnCtl::Admin::Faults(TarnCtl::Admin::Host().db());
+    ASSERT_EQ(faults.size(), 1u);
+    EXPECT_EQ(faults[0].fired, c.fired) << "skip " << c.skip << " times " << c.times;
+    EXPECT_EQ(TarnCtl::Store::Faults::Spent(faults[0]), !c.always) << c.outcomes;
   }
   // The row's texts are the exception's, and the first matching row fires.
   Arm({"GetVlanId", std::nullopt, "first", "first in detail", 0, 1});

@@ -104,7 +104,7 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
   } cases[] = {
       {"foreign.db", "not a host database (application id 0x7)" + init},
       {"newer.db",
-       "schema version 9 is newer than this library's 1; use the newer release that made it, or "
+       "schema version 9 is newer than this library's 2; use the newer release that made it, or "
        "set TARN_HOST_DB to another host file"},
       {"text.db", "not a host database (not an SQLite database)" + init},
       {"short.db", "not a host database (truncated header)" + init},

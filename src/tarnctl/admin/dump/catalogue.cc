@@ -6,6 +6,7 @@
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/instrument/operations.h"
 #include "tarnctl/model/words.h"
+#include "tarnctl/store/faults.h"
 
 namespace TarnCtl::Admin::Dump {
 
@@ -64,6 +65,42 @@ Column Seq() {
 }
 Column Flag(const char* name) {
   return Int(name, kFlag);
+}
+
+// A column that a dump of version 1 made before it existed may lack.
+Column Newer(Column column) {
+  column.absent = 0;
+  return column;
+}
+
+// The fault's columns, from its one description (store/faults.h).
+std::vector<Column> FaultColumns() {
+  using Store::Faults::Value;
+  std::vector<Column> columns;
+  const Store::Faults::Row none;
+  Store::Faults::VisitFields(none, [&](const Store::Faults::Field& field, const auto&) {
+    switch (field.value) {
+      case Value::kId:
+        return columns.push_back(Int(field.column, kFaultId));
+      case Value::kOperation:
+        return columns.push_back(Text(field.column, CheckOperation));
+      case Value::kTarget:
+        return columns.push_back(OptName(field.column, NameKind::kFaultTarget));
+      case Value::kText:
+        return columns.push_back(Text(field.column));
+      case Value::kSkip:
+        return columns.push_back(Int(field.column, Model::kFaultSkip));
+      case Value::kTimes:
+        return columns.push_back(Int(field.column, Model::kFaultTimesLeft));
+      case Value::kDelay:
+        return columns.push_back(Newer(Int(field.column, Model::kFaultDelay)));
+      case Value::kFlag:
+        return columns.push_back(Newer(Flag(field.column)));
+      case Value::kCount:
+        return columns.push_back(Newer(Int(field.column, Model::kFaultFired)));
+    }
+  });
+  return columns;
 }
 
 }  // namespace
@@ -138,12 +175,7 @@ const std::vector<Table>& Tables() {
        "layer, portset, lag_id",
        {Layer(), Name("portset", NameKind::kPortset), Int("lag_id", kUint32),
         Int("timeout", Model::kTimeout)}},
-      {"fault",
-       "id",
-       {Int("id", kFaultId), Text("operation", CheckOperation),
-        OptName("target", NameKind::kFaultTarget), Text("message"), Text("detail"),
-        Int("skip", Model::kFaultSkip), Int("times", Model::kFaultTimes)},
-       "id"},
+      {"fault", "id", FaultColumns(), "id"},
   };
   return tables;
 }

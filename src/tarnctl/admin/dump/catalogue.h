@@ -31,6 +31,8 @@ struct Column {
   const Model::Range* range = nullptr;       // kInt
   std::optional<Model::NameKind> name_rule;  // kText, kOptText
   TextRule rule = nullptr;                   // kText
+  // A kInt column that older dumps lack: the value a row without it takes.
+  std::optional<int64_t> absent = std::nullopt;
 };
 
 struct Table;

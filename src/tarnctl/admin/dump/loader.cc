@@ -7,11 +7,12 @@
 // parser. Keys may come in any order, tables may be left out (they are
 // empty), and a row may leave out its "seq" (or a fault its "id"): those
 // are assigned in file order after every row is in, and meta's "next_seq"
-// and "ens_node" are inferred when absent. Every value is held to the rule
-// the library applies to it (the catalogue names each, and the rules
-// between a row's fields), and the whole host to the library's invariants;
-// the first fault found is refused naming its table, row and field, and
-// the host is left as it was (the load is one transaction).
+// and "ens_node" are inferred when absent; a column that older dumps lack
+// takes its default. Every value is held to the rule the library applies
+// to it (the catalogue names each, and the rules between a row's fields),
+// and the whole host to the library's invariants; the first fault found is
+// refused naming its table, row and field, and the host is left as it was
+// (the load is one transaction).
 #include <algorithm>
 #include <map>
 #include <optional>
@@ -346,6 +347,10 @@ class Loader {
       const bool isCounter = counter != nullptr && std::string_view(c.name) == t.counter;
       if (given[i]) {
         if (isCounter) counter->given = std::max(counter->given, std::get<int64_t>(values[i]));
+        continue;
+      }
+      if (c.absent) {
+        values[i] = *c.absent;
         continue;
       }
       if (!isCounter) BadField(c, "is missing");
