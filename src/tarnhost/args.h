@@ -47,7 +47,7 @@ struct OptionDef {
   const char* name;             // without the leading "--"
   const char* value = nullptr;  // placeholder of its value in usage text; none: a flag
   bool repeatable = false;
-  const char* help = "";
+  std::string help;
   Kind kind = Kind::Text;  // of its value
 
   bool TakesValue() const { return value != nullptr; }

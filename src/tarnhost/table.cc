@@ -2,6 +2,9 @@
 
 #include <algorithm>
 
+#include "tarnctl/admin/snapshots.h"
+#include "tarnctl/model/limits.h"
+#include "tarnctl/model/names.h"
 #include "tarnhost/commands.h"
 #include "tarnhost/complete.h"
 #include "tarnhost/help.h"
@@ -23,9 +26,18 @@ const OptionDef kUplinks{.name = "uplinks",
 #define LIST_FORM \
   " Fields are separated by a tab and lists within a field by commas; an empty field is none."
 
-#define TIMEOUT_RULES                                                                       \
-  "The timeout is 0 to 255 and the portset 1 to 31 bytes; the portset need not exist yet, " \
-  "and a record with the same key must not be stored already."
+// Ranges and name lengths as the host's rules have them.
+std::string Span(const TarnCtl::Model::Range& range) {
+  return std::to_string(range.min) + " to " + std::to_string(range.max);
+}
+std::string Bytes(TarnCtl::Model::NameKind kind) {
+  return "1 to " + std::to_string(TarnCtl::Model::RuleOf(kind).maxBytes) + " bytes";
+}
+
+const std::string kTimeoutRules = "The timeout is " + Span(TarnCtl::Model::kTimeout) +
+                                  " and the portset " + Bytes(TarnCtl::Model::NameKind::kPortset) +
+                                  "; the portset need not exist yet, and a record with the same "
+                                  "key must not be stored already.";
 
 bool StartsWith(const Words& words, const Words& prefix) {
   return words.size() >= prefix.size() && std::equal(prefix.begin(), prefix.end(), words.begin());
@@ -94,7 +106,9 @@ const std::vector<Command>& Commands() {
        .summary = "keep the whole host as a snapshot named NAME",
        .help = "Replaces a snapshot of that name. Snapshots are files in the folder PATH.snapshots "
                "beside the host file PATH; a snapshot holds every table of the host, its faults "
-               "and events too. NAME is 1 to 64 bytes, without '/' or a control character, and "
+               "and events too. NAME is 1 to " +
+               std::to_string(TarnCtl::Admin::kSnapshotNameMax) +
+               " bytes, without '/' or a control character, and "
                "does not start with '.'.",
        .run = SaveSnapshot},
       {.words = {"snapshot", "restore"},
@@ -135,7 +149,7 @@ const std::vector<Command>& Commands() {
       {.words = {"pnic", "add"},
        .syntax = {.arguments = {{"NAME"}}},
        .summary = "add a physical NIC",
-       .help = "Its name is 1 to 31 bytes and unique.",
+       .help = "Its name is " + Bytes(TarnCtl::Model::NameKind::kPnic) + " and unique.",
        .run = AddPnic},
       {.words = {"pnic", "del"},
        .syntax = {.arguments = {{"NAME", Kind::Pnic}}},
@@ -153,7 +167,8 @@ const std::vector<Command>& Commands() {
        .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup}, {"CLIENT"}}},
        .summary = "connect a client to a port group",
        .help = "The port group is one of the running state; the client takes one port of its "
-               "switch. Client names are 1 to 127 bytes, unique on their port group.",
+               "switch. Client names are " +
+               Bytes(TarnCtl::Model::NameKind::kClient) + ", unique on their port group.",
        .run = AddClient},
       {.words = {"client", "del"},
        .syntax = {.arguments = {{"PORTGROUP", Kind::PortGroup}, {"CLIENT", Kind::Client}}},
@@ -190,7 +205,8 @@ const std::vector<Command>& Commands() {
                               kPorts,
                               {.name = "mtu",
                                .value = "N",
-                               .help = "MTU, 1280 to 9000 (default 1500)",
+                               .help = "MTU, " + Span(TarnCtl::Model::kMtu) + " (default " +
+                                       std::to_string(TarnCtl::Model::kDefaultMtu) + ")",
                                .kind = Kind::Number},
                               kUplinks}},
        .summary = "add a distributed switch",
@@ -260,7 +276,7 @@ const std::vector<Command>& Commands() {
                                 {"LAGID", Kind::Number},
                                 {"TIMEOUT", Kind::Number}}},
        .summary = "store an uplink timeout record",
-       .help = "orvocfg-vswitch -O loads the matching records. " TIMEOUT_RULES,
+       .help = "orvocfg-vswitch -O loads the matching records. " + kTimeoutRules,
        .run = AddUplinkTimeout},
       {.words = {"timeout", "add", "lag"},
        .also = {{"timeout", "lag"}},
@@ -268,7 +284,7 @@ const std::vector<Command>& Commands() {
                                 {"LAGID", Kind::Number},
                                 {"TIMEOUT", Kind::Number}}},
        .summary = "store a LAG timeout record",
-       .help = "orvocfg-vswitch -G loads the matching records. " TIMEOUT_RULES,
+       .help = "orvocfg-vswitch -G loads the matching records. " + kTimeoutRules,
        .run = AddLagTimeout},
       {.words = {"timeout", "del", "uplink"},
        .syntax = {.arguments = {{"PORTSET", Kind::Portset},
