@@ -29,13 +29,15 @@ import concurrent.futures
 import os
 import re
 import shutil
+import subprocess
 import sys
 import tempfile
 import time
 from dataclasses import dataclass
 
 from hosts import SWITCH, make_host, new_host, tarnhost
-from measure import Counts, Failed, Spread, counts, missing_tools, peak_rss_kib, time_interleaved
+from measure import (Counts, Failed, Spread, counts, instructions, missing_tools, peak_rss_kib,
+                     time_interleaved)
 
 HERE = os.path.dirname(os.path.abspath(__file__))
 
@@ -47,6 +49,7 @@ LIST_PEAK_MIB = 16          # -l at 100,000 port groups
 DUMP_LOAD_S = 1.0           # tarnhost dump and load of 100,000 port groups
 SNAPSHOT_S = 0.2            # tarnhost snapshot save and restore of 100,000 port groups
 DIFF_S = 1.0                # tarnhost diff of two hosts of 100,000 port groups
+TRACE_JSON = 1.05           # -A with the JSON trace against the text trace, instructions
 
 SMALL, LARGE, HUGE = 10, 10_000, 100_000  # port groups of the hosts
 # On the big host, which keeps the snapshot "bench" of itself: the diff
@@ -153,6 +156,7 @@ class Bench:
         self.small, self.large = self.host("small", SMALL), self.host("large", LARGE)
         self.huge = self.host("big", self.big)
         self.default = self.host("default")
+        self.traced = self.host("traced", SMALL)
         self.scratch = self.host("scratch", None, "--empty")
         self.dump_file = os.path.join(self.huge.home, "dump.json")
         with open(self.dump_file, "wb") as f:
@@ -182,6 +186,21 @@ class Bench:
         snapshots = self.count(self.huge, [[self.tarnhost, *a] for a in SNAPSHOT_COMMANDS])
         return lst, peak, floor, dump, snapshots
 
+    def count_trace(self):
+        """Instructions of -A with the text trace and with the JSON trace."""
+        host, result = self.traced, {}
+        for form in ("text", "json"):
+            env = dict(host.env, TARN_TRACE=os.path.join(host.home, "trace." + form))
+            env.pop("TARN_TRACE_FORMAT", None)
+            if form == "json":
+                env["TARN_TRACE_FORMAT"] = "json"
+            scratch = os.path.join(host.home, "A-trace-" + form)
+            result[form] = instructions([self.tool, "-A", "benchpg", SWITCH], env, scratch)
+            if not self.keep:
+                os.unlink(scratch + ".callgrind")
+            subprocess.run([self.tool, "-D", "benchpg", SWITCH], env=env, check=True)
+        return result
+
     def count_all(self):
         load = [self.tarnhost, "load", self.dump_file]
         jobs = {  # longest first: two workers
@@ -190,6 +209,7 @@ class Bench:
             "small": lambda: self.count_one_object(self.small),
             "large": lambda: self.count_one_object(self.large),
             "start": lambda: self.count(self.default, [[self.tool, "-c", "vswitch0"], ["/bin/true"]]),
+            "trace": self.count_trace,
         }
         with concurrent.futures.ThreadPoolExecutor(max_workers=2) as pool:
             futures = {name: pool.submit(job) for name, job in jobs.items()}
@@ -198,6 +218,7 @@ class Bench:
         self.counts_c, self.counts_true = c["start"]
         self.counts_list, self.peak_kib, self.floor_kib, self.counts_dump, self.counts_snapshots = c["big"]
         self.counts_load = c["load"]
+        self.counts_trace = c["trace"]
 
     # -- wall time (one run at a time) ---------------------------------------
     def time_all(self):
@@ -286,6 +307,10 @@ class Bench:
             limit = (DIFF_S if a[0] == "diff" else SNAPSHOT_S) * g / HUGE
             rows.append(wall_row(f"tarnhost {' '.join(a)} wall time ({number(g)})", Spread.limit(spread),
                                  limit, f"<= {limit * 1e3:g} ms", lambda v: f"{v * 1e3:.0f} ms"))
+        text, json = self.counts_trace["text"], self.counts_trace["json"]
+        rows.append(count_row(f"-A instructions, JSON trace vs text trace ({number(SMALL)})",
+                              f"{ratio(text, json):.3f}x ({number(text)} -> {number(json)})",
+                              ratio(text, json), TRACE_JSON, f"<= {TRACE_JSON:.2f}x"))
         return rows
 
 

@@ -19,3 +19,6 @@ becomes a transcript of its own, on a default host of its own.
   $ check host.md Faults
   .
   # Ran 1 tests, 0 skipped, 0 failed.
+  $ check host.md "The JSON trace"
+  .
+  # Ran 1 tests, 0 skipped, 0 failed.

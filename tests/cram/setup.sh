@@ -1,7 +1,7 @@
 # Sourced first by every transcript: each test gets a host database of its
 # own in its scratch directory, and no library tracing.
 export TARN_HOST_DB="$PWD/host.db"
-unset TARN_TRACE
+unset TARN_TRACE TARN_TRACE_FORMAT
 # Words after the script's name, in their order: "init" makes the default
 # host (silently), "trace" turns the library's trace on into ./trace.
 for word; do

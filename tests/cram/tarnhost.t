@@ -392,3 +392,44 @@ it is removed. A dump made before faults had those fields loads with none.
   2|0|0|||0|spent
   $ tarnhost fault clear && tarnhost fault list | wc -l
   0
+
+The trace as JSON lines: a record when a program opens the host, one per
+call as it ends (its outcome: ok, refused with the message, or the fault's
+number), one when the run ends; tarnhost's commands only when they change
+the host. A killed run has no end record.
+
+  $ export TARN_TRACE=$PWD/trace.json TARN_TRACE_FORMAT=json
+  $ tarnhost fault add AddPortGroup --message $'bad\xff\t' && tarnhost fault list > /dev/null
+  $ orvocfg-vswitch -A pg2 vswitch0; orvocfg-vswitch -A pg1 vswitch0; orvocfg-vswitch -A pg2 vswitch0
+  Failed to add portgroup: pg2 to vswitch: vswitch0, Error: bad\xff\t (esc)
+  Failed to add portgroup: pg1 to vswitch: vswitch0, Error: Portgroup pg1 already exists
+  $ jq -c 'del(.pid, .time, .host)' trace.json | grep -v -e NetworkInfoImpl -e GetVirtualSwitchInfo
+  {"event":"open","program":"tarnhost","arguments":["fault","add","AddPortGroup","--message","bad\xef\xbf\xbd\\t"]} (esc)
+  {"event":"end","status":0,"outcome":"committed"}
+  {"event":"open","program":"orvocfg-vswitch","arguments":["-A","pg2","vswitch0"]}
+  {"event":"call","operation":"GetVirtualSwitchById","arguments":"\"vswitch0\", 0","on":null,"outcome":"ok"}
+  {"event":"call","operation":"AddPortGroup","arguments":"\\"pg2\\"","on":"vswitch0","outcome":"fault","fault":1,"message":"bad\xef\xbf\xbd\\t"} (esc)
+  {"event":"call","operation":"GetName","arguments":"","on":"vswitch0","outcome":"ok"}
+  {"event":"end","status":1,"outcome":"committed"}
+  {"event":"open","program":"orvocfg-vswitch","arguments":["-A","pg1","vswitch0"]}
+  {"event":"call","operation":"GetVirtualSwitchById","arguments":"\"vswitch0\", 0","on":null,"outcome":"ok"}
+  {"event":"call","operation":"AddPortGroup","arguments":"\"pg1\"","on":"vswitch0","outcome":"refused","message":"Portgroup pg1 already exists"}
+  {"event":"call","operation":"GetName","arguments":"","on":"vswitch0","outcome":"ok"}
+  {"event":"end","status":1,"outcome":"committed"}
+  {"event":"open","program":"orvocfg-vswitch","arguments":["-A","pg2","vswitch0"]}
+  {"event":"call","operation":"GetVirtualSwitchById","arguments":"\"vswitch0\", 0","on":null,"outcome":"ok"}
+  {"event":"call","operation":"AddPortGroup","arguments":"\"pg2\"","on":"vswitch0","outcome":"ok"}
+  {"event":"end","status":0,"outcome":"committed"}
+  $ jq -s -c 'group_by(.pid) | map(map(.event) | unique)' trace.json; jq -r 'select(.event == "open") | .time' trace.json |
+  >   grep -cE '^[0-9]{4}-[0-9]{2}-[0-9]{2}T[0-9:]{8}\.[0-9]{3}Z$'
+  [["end","open"],["call","end","open"],["call","end","open"],["call","end","open"]]
+  4
+  $ tarnhost fault add GetVirtualSwitchById --delay 10000 --pass && : > trace.json
+  $ orvocfg-vswitch -A pg3 vswitch0 & until grep -q GetVirtualSwitchInfo trace.json; do sleep 0.05; done
+  $ kill -9 $! && wait $! 2>/dev/null; jq -c '[.event, .operation]' trace.json
+  ["open",null]
+  ["call","NetworkInfoImpl"]
+  ["call","GetVirtualSwitchInfo"]
+  $ unset TARN_TRACE TARN_TRACE_FORMAT; tarnhost fault list | cut -f2,11 | tr '\t' '|'
+  AddPortGroup|1
+  GetVirtualSwitchById|0

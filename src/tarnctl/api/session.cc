@@ -41,14 +41,20 @@ void Session::End() noexcept {
     // SQLite ended the run after a failure, which its operation reported:
     // nothing is left to commit, or to say.
     run_.reset();
+    if (traced_) Instrument::TraceRunEnded(false, false);
     return;
   }
   try {
     run_->Commit();
     run_.reset();
+    if (traced_) Instrument::TraceRunEnded(true, host_->db().ChangeCount() != changesAtOpen_);
   } catch (const HostCtlException& e) {
     std::fprintf(stderr, "%s\n", e.GetDetailedMessage().c_str());
     std::fflush(stderr);
+    if (traced_) {
+      Instrument::TraceRunEnded(host_->db().CommitWaitsInLog(), true);
+      Instrument::TraceRunExit(1);
+    }
     _exit(1);
   }
 }
@@ -57,9 +63,11 @@ void Session::Commit() {
   try {
     run_->Commit();
   } catch (const HostCtlException&) {
+    if (traced_) Instrument::TraceRunEnded(host_->db().CommitWaitsInLog(), true);
     run_.reset();  // undoes what a failed commit left open; the caller reports the failure
     throw;
   }
+  if (traced_) Instrument::TraceRunEnded(true, host_->db().ChangeCount() != changesAtOpen_);
   run_.reset();
   run_.emplace(host_->db());
 }
@@ -101,7 +109,7 @@ std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
     new std::weak_ptr<Session>(std::move(process.session));
     process.session.reset();
   }
-  Instrument::ConfigureTrace(std::getenv("TARN_TRACE"));
+  Instrument::ConfigureTrace(std::getenv("TARN_TRACE"), std::getenv("TARN_TRACE_FORMAT"));
   auto host = Store::HostFile::Open(location, options);
   if (host->created()) {
     std::fprintf(stderr, "created a new default host at %s\n", host->path().c_str());
@@ -123,6 +131,10 @@ std::shared_ptr<Session> Session::AcquireAt(const Store::Location& location,
     return true;
   }();
   (void)registered;
+  // The process's session is its run in the JSON trace.
+  session->traced_ = true;
+  session->changesAtOpen_ = session->db().ChangeCount();
+  Instrument::TraceRunOpened(session->path());
   return session;
 }
 

@@ -70,6 +70,8 @@ class Session {
   Store::Location location_;
   std::unique_ptr<Store::HostFile> host_;
   std::optional<Store::Transaction> run_;
+  bool traced_ = false;        // the process's session: a run of the JSON trace
+  int64_t changesAtOpen_ = 0;  // the connection's changes when it opened
 };
 
 }  // namespace TarnCtl::Api

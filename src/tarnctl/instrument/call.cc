@@ -40,7 +40,12 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
     previousContext_ = db_->context();
     db_->set_context(g_running);
   }
-  if (TraceOn()) {
+  if (TraceJson()) {
+    recorded_ = true;
+    target_ = target;
+    args_ = args;
+    errorsMade_ = Store::LastErrorMade().count;
+  } else if (TraceOn()) {
     std::string line;
     if (!target.record.empty()) line.append(target.record).append("::");
     line.append(operation.name).append(1, '(').append(args).append(1, ')');
@@ -54,14 +59,20 @@ Call::Call(Store::Db* db, Op op, const Target& target, const std::string& args, 
   try {
     // A fault is used up even when it makes the operation fail: it is taken
     // before the savepoint that a failure undoes.
-    if (auto fired = TakeFault(*db_, g_running, target.names); fired && fired->failure) {
-      if (onFault == OnFault::kThrow) throw *fired->failure;
-      failed_ = true;
+    if (auto fired = TakeFault(*db_, g_running, target.names)) {
+      fault_ = fired->number;
+      if (fired->failure && onFault == OnFault::kThrow) {
+        Record(CallOutcome::Kind::kFault, &fired->failure->GetMessage());
+        throw *fired->failure;
+      }
+      failed_ = fired->failure.has_value();
+      if (failed_ && recorded_) faultMessage_ = fired->failure->GetMessage();
     }
     if (operation.access == kChanges) savepoint_.emplace(*db_);
     changes_ = db_->ChangeCount();
     reads_ = operation.access != kChanges;
   } catch (...) {
+    Record(CallOutcome::Kind::kRefused);
     Leave();
     throw;
   }
@@ -71,15 +82,34 @@ Call::~Call() noexcept(false) {
   // The registry must say which operations change the host: only those are
   // undone whole.
   assert(db_ == nullptr || !reads_ || db_->ChangeCount() == changes_);
+  const bool returns = std::uncaught_exceptions() == uncaught_;
   try {
-    if (savepoint_ && std::uncaught_exceptions() == uncaught_) savepoint_->Commit();
+    if (savepoint_ && returns) savepoint_->Commit();
   } catch (...) {
     savepoint_.reset();
+    Record(CallOutcome::Kind::kRefused);
     Leave();
     throw;
   }
   savepoint_.reset();
+  if (!returns) {
+    Record(CallOutcome::Kind::kRefused);
+  } else {
+    Record(failed_ ? CallOutcome::Kind::kFault : CallOutcome::Kind::kOk);
+  }
   Leave();
+}
+
+void Call::Record(CallOutcome::Kind kind, const std::string* message) {
+  if (!recorded_) return;
+  recorded_ = false;
+  const Store::ErrorMade& made = Store::LastErrorMade();
+  // A refusal's message is the last one the library made during the call.
+  if (kind == CallOutcome::Kind::kRefused && message == nullptr && made.count != errorsMade_) {
+    message = &made.message;
+  }
+  if (kind == CallOutcome::Kind::kFault && message == nullptr) message = &faultMessage_;
+  TraceCallRecord(target_.record, g_running, args_, target_.on, {kind, message, fault_});
 }
 
 void Call::Leave() {

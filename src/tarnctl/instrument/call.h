@@ -75,6 +75,8 @@ class Call {
  private:
   Call(Store::Db* db, Op op, const Target& target, const std::string& args, OnFault onFault);
   void Leave();
+  // The JSON trace's record of the call, as it ends.
+  void Record(CallOutcome::Kind kind, const std::string* message = nullptr);
 
   Store::Db* db_;
   const char* previous_;
@@ -84,6 +86,13 @@ class Call {
   bool reads_ = false;
   int64_t changes_ = 0;  // the connection's changes when the operation began
   std::optional<Store::Transaction> savepoint_;
+  // For the JSON trace's record (json_trace.cc), when it is on.
+  bool recorded_ = false;
+  Target target_;
+  std::string args_;
+  int64_t fault_ = 0;         // the number of the fault that fired on it
+  std::string faultMessage_;  // what it said, when the call reports it
+  uint64_t errorsMade_ = 0;   // exceptions made in the process when it began
 };
 
 // An administration step that is not a library operation (tarnhost's

@@ -11,6 +11,7 @@
 #include <string>
 
 #include "hostctl/exception.h"
+#include "tarnctl/store/errors_made.h"
 
 namespace TarnCtl::Instrument {
 
@@ -22,7 +23,9 @@ class Refusal : public HostCtl::Lib::HostCtlException {
   Refusal(const std::string& operation, const std::string& message, const std::string& explanation)
       : HostCtlException(message, operation.empty() ? explanation : operation + ": " + explanation),
         operation_(operation),
-        explanation_(explanation) {}
+        explanation_(explanation) {
+    Store::NoteErrorMade(message);
+  }
   const std::string& operation() const { return operation_; }
   const std::string& explanation() const { return explanation_; }
 

@@ -16,6 +16,10 @@
 
 namespace TarnCtl::Instrument {
 
+// Writes the end record of a JSON trace's run when the process exits
+// (json_trace.cc).
+void WatchExit();
+
 namespace {
 
 // The fields of a record in braces, in the order a visitor meets them.
@@ -60,6 +64,7 @@ struct TraceFile {
   // The file ends inside a line (a write cut short, on a full disk, say):
   // the next line starts on a line of its own.
   bool torn = false;
+  bool json = false;  // JSON lines (json_trace.cc)
 };
 
 // Whether the file at `path`, open for appending as `fd`, ends inside a
@@ -186,13 +191,15 @@ void AppendArg(std::string& line, const HostCtl::Network::NicCapabilities& capab
   line += '{' + FormatArgs(capabilities.offloadBits, capabilities.reserved) + '}';
 }
 
-void ConfigureTrace(const char* path) {
+void ConfigureTrace(const char* path, const char* format) {
   TraceFile& file = File();
   const std::string wanted = path != nullptr ? path : "";
   file.configured = true;
+  file.json = format != nullptr && std::strcmp(format, "json") == 0;
+  if (file.json) WatchExit();
   if (wanted == file.path) return;
   if (file.fd >= 0) close(file.fd);
-  file = TraceFile{true, wanted, -1, false};
+  file = TraceFile{true, wanted, -1, false, false, file.json};
   if (wanted.empty()) return;
   file.fd = open(path, O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC | O_NOCTTY | O_NONBLOCK, 0644);
   if (file.fd < 0) {
@@ -204,8 +211,12 @@ void ConfigureTrace(const char* path) {
 
 bool TraceOn() {
   TraceFile& file = File();
-  if (!file.configured) ConfigureTrace(std::getenv("TARN_TRACE"));
+  if (!file.configured) ConfigureTrace(std::getenv("TARN_TRACE"), std::getenv("TARN_TRACE_FORMAT"));
   return !file.path.empty() && !file.broken;
+}
+
+bool TraceJson() {
+  return TraceOn() && File().json;
 }
 
 void WriteTraceLine(const std::string& line) {

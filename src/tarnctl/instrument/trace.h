@@ -42,6 +42,7 @@
 #include <concepts>
 #include <cstdint>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "hostctl/records.h"
@@ -89,13 +90,44 @@ std::string FormatArgs(const Args&... args) {
   return text;
 }
 
-// Traces into the file `path` names from now on (null or empty: no trace).
-// The library's edge calls it with TARN_TRACE whenever it opens the host;
-// a process that traces before that reads TARN_TRACE once itself.
-void ConfigureTrace(const char* path);
+// Traces into the file `path` names from now on (null or empty: no trace),
+// as JSON lines when `format` is "json", else as the text lines above. The
+// library's edge calls it with TARN_TRACE and TARN_TRACE_FORMAT whenever it
+// opens the host; a process that traces before that reads them once itself.
+void ConfigureTrace(const char* path, const char* format = nullptr);
 // True while the configured trace file can be written.
 bool TraceOn();
+// True when the trace is on and made of JSON lines (json_trace.cc).
+bool TraceJson();
 // Appends `line` and a newline to the trace file. REQUIRES: TraceOn().
 void WriteTraceLine(const std::string& line);
+
+// The JSON trace's records (json_trace.cc). All of them do nothing unless
+// TraceJson().
+//
+// A run is a process's time with its host. Opening the host is noted; its
+// record is written before the run's first other record: the first call's,
+// or the end's of a run that changed the host without library calls (a
+// tarnhost command). A run with an open record gets an end record when
+// the process exits.
+void TraceRunOpened(const std::string& host);
+// The run's session ended: committed, or rolled back. `changed`: it
+// changed the host (a run without calls is recorded only then).
+void TraceRunEnded(bool committed, bool changed);
+// Writes the end record now, for a process that ends without exit().
+void TraceRunExit(int status);
+
+// How a call ended: ok, refused with a message, or failed (or, for `pass`,
+// slowed down) by the fault numbered `fault`.
+struct CallOutcome {
+  enum class Kind { kOk, kRefused, kFault } kind = Kind::kOk;
+  const std::string* message = nullptr;  // none: unknown
+  int64_t fault = 0;                     // 0: none
+};
+// The record of a call when it ends: `record` ("" or a record's name
+// before "::"), the operation, its arguments as the text trace writes them,
+// the object it was called on ("" for none), and its outcome.
+void TraceCallRecord(std::string_view record, const char* operation, const std::string& args,
+                     std::string_view on, const CallOutcome& outcome);
 
 }  // namespace TarnCtl::Instrument

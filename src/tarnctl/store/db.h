@@ -20,6 +20,7 @@
 #include <vector>
 
 #include "hostctl/exception.h"
+#include "tarnctl/store/errors_made.h"
 
 struct sqlite3;
 struct sqlite3_stmt;
@@ -70,7 +71,9 @@ class DbError : public HostCtl::Lib::HostCtlException {
  public:
   DbError(const std::string& operation, const std::string& message)
       : HostCtlException(message, operation.empty() ? message : operation + ": " + message),
-        operation_(operation) {}
+        operation_(operation) {
+    NoteErrorMade(message);
+  }
   const std::string& operation() const { return operation_; }
 
  private:
@@ -169,6 +172,9 @@ class Db {
   // when SQLite ended it by itself (an I/O error or a full disk rolls it
   // back).
   bool InTransaction() const;
+  // After a failed commit: whether it was made, and only its copy from
+  // the log into the file failed.
+  bool CommitWaitsInLog() const { return copyFailed_ != 0 && !InTransaction(); }
 
   // What kind of failure the last failed call of this connection met.
   using Failure = DbFailure::Kind;
