@@ -41,7 +41,7 @@ for command, options in table.items():
 
 # Under COMMANDS, a command's tag is .TP, then a font macro with its words quoted.
 man = {}
-lines = open(f"{root}/docs/man/tarnhost.8").read().split("\n")
+lines = open(f"{root}/docs/man/tarnhost.8.in").read().split("\n")
 start = lines.index(".SH COMMANDS")
 end = next(i for i in range(start + 1, len(lines)) if lines[i].startswith(".SH"))
 command = None

@@ -68,10 +68,10 @@ fi
 # that they are the same from build to build.
 compressed=("$doc/changelog.gz|$source_dir/packaging/changelog")
 for c in "${commands[@]}"; do
-    compressed+=("share/man/man8/$c.8.gz|$source_dir/docs/man/$c.8")
-    th=$(sed -n '/^\.TH /p' "$source_dir/docs/man/$c.8")
+    compressed+=("share/man/man8/$c.8.gz|$source_dir/docs/man/$c.8.in")
+    th=$(sed -n '/^\.TH /p' "$source_dir/docs/man/$c.8.in")
     [[ $th == *' "orvocfg-vswitch @PROJECT_VERSION@" '* ]] ||
-        fail "docs/man/$c.8: no version placeholder on the .TH line: $th"
+        fail "docs/man/$c.8.in: no version placeholder on the .TH line: $th"
 done
 for pair in "${compressed[@]}"; do
     file=${pair%%|*} source=${pair#*|}
