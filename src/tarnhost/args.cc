@@ -50,66 +50,73 @@ std::string Join(const std::vector<std::string>& words, const char* separator) {
   return text;
 }
 
+Tokens Tokenize(const std::vector<std::string>& words, const Syntax& syntax) {
+  Tokens tokens;
+  if (syntax.raw) {
+    tokens.arguments = words;
+    return tokens;
+  }
+  const auto end = syntax.rest ? std::find(words.begin(), words.end(), "--") : words.end();
+  if (syntax.rest && end != words.end()) tokens.rest.emplace(end + 1, words.end());
+  const size_t own = end - words.begin();
+  for (size_t i = 0; i < own; ++i) {
+    const std::string& word = words[i];
+    if (tokens.ended || !IsOptionWord(word)) {
+      tokens.arguments.push_back(word);
+    } else if (word == "--") {
+      tokens.ended = true;
+    } else if (IsHelpWord(word)) {
+      tokens.help = true;
+    } else {
+      const auto eq = word.find('=');
+      Tokens::Option option{word.substr(0, eq), nullptr, std::nullopt};
+      if (word.compare(0, 2, "--") == 0) option.def = syntax.Option(option.word.substr(2));
+      if (eq != std::string::npos) {
+        option.value = word.substr(eq + 1);
+        option.inlineValue = true;
+      } else if (option.def && option.def->TakesValue() && i + 1 < own) {
+        option.value = words[++i];
+      }
+      tokens.options.push_back(std::move(option));
+    }
+  }
+  if (syntax.rest && end != words.end()) tokens.ended = true;
+  return tokens;
+}
+
 Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
            const std::string& command) {
-  if (syntax.raw) {
-    positional_ = words;
-    return;
-  }
   // The first mistake is reported, but only once every word was seen: a
   // --help further on wins.
   std::optional<std::string> mistake;
   auto refuse = [&](const std::string& why) {
     if (!mistake) mistake = why;
   };
-  bool optionsEnded = false;
-  // With syntax.rest, the options end at "--" and the arguments follow.
-  const auto end = syntax.rest ? std::find(words.begin(), words.end(), "--") : words.end();
-  const size_t own = end - words.begin();
-  for (size_t i = 0; i < own; ++i) {
-    const std::string& word = words[i];
-    if (optionsEnded || !IsOptionWord(word)) {
-      positional_.push_back(word);
-      continue;
-    }
-    if (word == "--") {
-      optionsEnded = true;
-      continue;
-    }
-    if (IsHelpWord(word)) {
-      help_ = true;
-      continue;
-    }
-    const auto eq = word.find('=');
-    const std::string name = word.substr(2, eq == std::string::npos ? eq : eq - 2);
-    const OptionDef* known = word.compare(0, 2, "--") == 0 ? syntax.Option(name) : nullptr;
-    if (!known) {
+  const Tokens tokens = Tokenize(words, syntax);
+  positional_ = tokens.arguments;
+  if (syntax.raw) return;
+  help_ = tokens.help;
+  for (const auto& option : tokens.options) {
+    if (!option.def) {
       std::vector<std::string> names;
       for (const auto& o : syntax.options) names.push_back("--" + std::string(o.name));
-      const std::string given = word.substr(0, eq);
-      refuse("unknown option " + given + " for " + command + DidYouMean(given, names));
+      refuse("unknown option " + option.word + " for " + command + DidYouMean(option.word, names));
       continue;
     }
-    std::string value;
-    if (known->TakesValue()) {
-      if (eq != std::string::npos) {
-        value = word.substr(eq + 1);
-      } else if (i + 1 < own) {
-        value = words[++i];
-      } else {
-        refuse("option --" + name + " needs a value");
-      }
-    } else if (eq != std::string::npos) {
+    const std::string name = option.def->name;
+    if (option.def->TakesValue() && !option.value) {
+      refuse("option --" + name + " needs a value");
+    } else if (!option.def->TakesValue() && option.inlineValue) {
       refuse("option --" + name + " takes no value");
     }
     auto& slot = values_[name];
-    if (!slot.empty() && !known->repeatable) refuse("option --" + name + " given twice");
-    slot.push_back(value);
+    if (!slot.empty() && !option.def->repeatable) refuse("option --" + name + " given twice");
+    slot.push_back(option.def->TakesValue() ? option.value.value_or("") : "");
   }
   if (syntax.rest) {
     if (!positional_.empty()) refuse("unexpected argument " + positional_[0] + " before --");
-    if (end == words.end()) refuse("missing -- before " + std::string(syntax.arguments[0].name));
-    positional_.assign(end == words.end() ? end : end + 1, words.end());
+    if (!tokens.rest) refuse("missing -- before " + std::string(syntax.arguments[0].name));
+    positional_ = tokens.rest.value_or(std::vector<std::string>{});
   }
   if (help_) return;
   if (mistake) throw UsageError(*mistake);

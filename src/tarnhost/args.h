@@ -74,6 +74,25 @@ struct Syntax {
   std::string Synopsis() const;
 };
 
+// The words of a command line as its syntax reads them, without judging
+// them: Args refuses what is wrong, completion looks at where the cursor
+// stands. Options end at "--" (with `rest`, at the first "--", and every
+// word after it is an argument as it is).
+struct Tokens {
+  struct Option {
+    std::string word;                  // as given, up to any "="
+    const OptionDef* def;              // null: not an option of the syntax
+    std::optional<std::string> value;  // after "=", or the next word for one that takes it
+    bool inlineValue = false;          // the value came after "="
+  };
+  std::vector<std::string> arguments;  // before "--" (all of them, without `rest`)
+  std::vector<Option> options;
+  bool help = false;                             // -h or --help among the options
+  bool ended = false;                            // a "--" was seen: what follows is no option
+  std::optional<std::vector<std::string>> rest;  // with `rest`: the words after "--"
+};
+Tokens Tokenize(const std::vector<std::string>& words, const Syntax& syntax);
+
 class Args {
  public:
   // Splits `words` by `syntax`; refuses unknown or repeated options and

@@ -129,25 +129,17 @@ int Complete(const Args& args) {
   // Where the current word stands: after an option that wants its value,
   // after "--", or at which argument.
   const Syntax& syntax = command->syntax;
-  const OptionDef* pending = nullptr;
-  bool optionsEnded = syntax.raw;
-  Words given, options;
-  for (size_t i = used; i < before.size(); ++i) {
-    const std::string& word = before[i];
-    if (pending) {
-      pending = nullptr;
-    } else if (optionsEnded || !IsOptionWord(word)) {
-      given.push_back(word);
-    } else if (word == "--") {
-      optionsEnded = true;
-    } else if (word[1] == '-') {
-      const std::string name = word.substr(0, word.find('='));
-      const OptionDef* o = syntax.Option(name.substr(2));
-      if (o && o->TakesValue() && name == word) pending = o;
-      options.push_back(name);
+  const Tokens tokens = Tokenize(Words(before.begin() + used, before.end()), syntax);
+  const bool optionsEnded = syntax.raw || tokens.ended;
+  const Words& given = tokens.rest ? *tokens.rest : tokens.arguments;
+  Words options;
+  for (const auto& option : tokens.options) options.push_back(option.word);
+  if (!tokens.options.empty() && !optionsEnded) {
+    const auto& last = tokens.options.back();
+    if (last.def && last.def->TakesValue() && !last.value) {
+      return OfferValue(last.def->kind, {}, current);
     }
   }
-  if (pending) return OfferValue(pending->kind, {}, current);
   if (!optionsEnded && current.compare(0, 2, "--") == 0 && current.find('=') != std::string::npos) {
     const std::string name = current.substr(0, current.find('='));
     const OptionDef* o = syntax.Option(name.substr(2));
