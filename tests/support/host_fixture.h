@@ -33,12 +33,17 @@ class HostTest : public ScratchTest {
   void SetUp() override {
     ScratchTest::SetUp();
     path_ = Path("host.db");
-    for (const char* name : {"TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
+    for (const char* name : {"TARN_TRACE", "TARN_TRACE_FORMAT", "TARN_LOCK_TIMEOUT"}) {
+      unsetenv(name);
+    }
     setenv("TARN_HOST_DB", path_.c_str(), 1);
   }
 
   void TearDown() override {
-    for (const char* name : {"TARN_HOST_DB", "TARN_TRACE", "TARN_LOCK_TIMEOUT"}) unsetenv(name);
+    for (const char* name :
+         {"TARN_HOST_DB", "TARN_TRACE", "TARN_TRACE_FORMAT", "TARN_LOCK_TIMEOUT"}) {
+      unsetenv(name);
+    }
     ScratchTest::TearDown();
   }
 

@@ -150,6 +150,8 @@ TEST_F(AdminTest, SeedingAndRemovalRefuseAndChangeNothing) {
       {fault({"GetName", {}, {}, {}, -1, 1}),
        "AddFault: Invalid skip count -1 (it must be 0 or more)"},
       {fault({"GetName", {}, {}, {}, 0, 0}), "AddFault: Invalid times 0 (it must be 1 or more)"},
+      {fault({"GetName", {}, {}, {}, 0, 1, -1}),
+       "AddFault: Invalid delay -1 ms (it must be 0 or more)"},
       {fault({"SetVlanID", {}, {}, {}, 0, 1}),
        "AddFault: Unknown operation SetVlanID (did you mean SetVlanId?)"},
       {[](Host& h) { RemovePnic(h.db(), "pnic0"); },

@@ -1,11 +1,16 @@
 // The call trace: one line per call, written when the call is entered, in
 // the format of src/tarnctl/trace.h. (The node calls' lines: the ens
 // transcript.)
+#include <unistd.h>
+
+#include <nlohmann/json.hpp>
+
 #include "host_fixture.h"
 
 namespace {
 
 using TraceTest = HostTest;
+using json = nlohmann::json;
 
 constexpr const char* kDvs0Uuid = "64 76 73 30 00 00 00 00-00 00 00 00 00 00 00 00";
 
@@ -64,6 +69,53 @@ TEST_F(TraceTest, ObjectsOfEachKindNameThemselves) {
       "GetPortId() on 100",
   };
   EXPECT_EQ(TraceLines(), expected);
+}
+
+// The JSON trace: the run's open record, then a record per call as it
+// ends, with how it ended. (Whole runs, their end and a killed one:
+// tarnhost.t.)
+TEST_F(TraceTest, JsonRecordsTellHowEachCallEnded) {
+  StartTrace();
+  setenv("TARN_TRACE_FORMAT", "json", 1);
+  auto arm = [](TarnCtl::Admin::FaultSeed seed) {
+    TarnCtl::Admin::AddFault(TarnCtl::Admin::Host().db(), seed);
+  };
+  arm({"SetVlanId", "Management", "bad\xff\x01", {}, 0, 1});
+  arm({"GetMTU", {}, {}, {}, 0, 1, 1, true});
+  arm({"NODI_CheckSig", {}, "nodi", {}, 0, 1});
+  {
+    NetworkInfoImpl network;
+    PortGroupImpl pg("Management");
+    EXPECT_THROW(pg.SetVlanId(5), HostCtl::Lib::HostCtlException);
+    EXPECT_THROW(pg.SetVlanId(5000), HostCtl::Lib::HostCtlException);
+    EXPECT_EQ(Switch("vswitch0")->GetMTU(), 1500u);
+    NODI_SigResult result;
+    EXPECT_NE(NODI_CheckSig(&result, 21, nullptr), TARN_OK);
+  }
+  std::vector<std::string> calls;
+  const auto lines = TraceLines();
+  ASSERT_FALSE(lines.empty());
+  const auto open = nlohmann::json::parse(lines[0]);
+  EXPECT_EQ(open["event"], "open");
+  EXPECT_EQ(open["pid"], getpid());
+  for (const std::string& line : lines) {
+    const auto record = nlohmann::json::parse(line);
+    if (record["event"] != "call" || record["operation"] == "NetworkInfoImpl") continue;
+    calls.push_back(record["operation"].get<std::string>() + " " +
+                    record["arguments"].get<std::string>() + " " + record["on"].dump() + " " +
+                    record["outcome"].get<std::string>() + " " +
+                    record.value("fault", json(0)).dump() + " " +
+                    record.value("message", json("-")).get<std::string>());
+  }
+  const std::vector<std::string> expected = {
+      "PortGroupImpl \"Management\" null ok 0 -",
+      "SetVlanId 5 \"Management\" fault 1 bad\xef\xbf\xbd\x01",
+      "SetVlanId 5000 \"Management\" refused 0 VLAN id 5000 is out of range",
+      "GetVirtualSwitchById \"vswitch0\", 0 null ok 0 -",
+      "GetMTU  \"vswitch0\" ok 2 -",
+      "NODI_CheckSig out, 21, out null fault 3 nodi",
+  };
+  EXPECT_EQ(calls, expected);
 }
 
 }  // namespace
