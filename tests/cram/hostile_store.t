@@ -36,7 +36,7 @@ log, and the next program copies it in (strace fails the system call; leak
 checks cannot run under it):
 
   $ export TARN_HOST_DB=$PWD/host.db; tarnhost init 2> /dev/null
-  $ fail() { local spec=$1; shift; ASAN_OPTIONS=${ASAN_OPTIONS:+$ASAN_OPTIONS:}detect_leaks=0 strace -f -o /dev/null -P "$PWD/host.db" -P "$PWD/host.db-wal" -e inject=$spec "$@" 2>&1 | sed "s|$PWD|PWD|g"; echo "status ${PIPESTATUS[0]}"; }
+  $ fail() { local how=$1; shift; ASAN_OPTIONS=${ASAN_OPTIONS:+$ASAN_OPTIONS:}detect_leaks=0 strace -f -o /dev/null -P "$PWD/host.db" -P "$PWD/host.db-wal" -e inject=$how "$@" 2>&1 | sed "s|$PWD|PWD|g"; echo "status ${PIPESTATUS[0]}"; }
   $ fail fdatasync:error=EIO:when=1 tarnhost pnic add pnicA
   tarnhost: Host database PWD/host.db: the change was made, but copying it from the log into the host file failed (disk I/O error): it waits in PWD/host.db-wal, and the next program to open the host copies it in
   status 1
