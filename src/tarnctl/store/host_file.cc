@@ -510,7 +510,9 @@ std::unique_ptr<HostFile> HostFile::Open(const Location& location, const OpenOpt
       bool halfMade = false;
       if (header != Header::kEmpty) {
         db = Connect(real, path, header);
-        halfMade = HalfMade(*db, path);
+        // Only an older release's creation, in rollback-journal mode, can
+        // stop half-way; a host in log mode was renamed into place whole.
+        halfMade = header == Header::kHost && HalfMade(*db, path);
         if (halfMade) {
           db.reset();
         } else {
