@@ -316,7 +316,10 @@ int SaveSnapshot(const Args& args) {
 
 int RestoreSnapshot(const Args& args) {
   const std::string name = SnapshotName(args);
-  return OnHost([&](Db& db) { Admin::RestoreSnapshot(db, Admin::HostPath(), name); });
+  Admin::Host host;
+  Admin::RestoreSnapshot(host, name);
+  host.Commit();
+  return 0;
 }
 
 int ListSnapshots(const Args&) {

@@ -17,8 +17,8 @@ struct Command {
   Words words;                   // e.g. {"pnic", "add"}
   std::vector<Words> also = {};  // other spellings that run it, not listed (older ones, -h)
   Syntax syntax = {};
-  const char* summary;  // one line, for the command lists
-  std::string help;     // a paragraph; "\n" starts another
+  const char* summary;    // one line, for the command lists
+  std::string help = {};  // a paragraph; "\n" starts another
   int (*run)(const Args& args) = nullptr;
   bool hidden = false;  // not listed, not completed
 

@@ -54,12 +54,27 @@ Snapshots: restored whole (faults and events too), in one transaction.
   $ tarnhost snapshot save after && tarnhost snapshot list
   after
   base
-  $ tarnhost snapshot restore base && tarnhost dump | cmp - base.json
+  $ TARN_TRACE=$PWD/t.json TARN_TRACE_FORMAT=json tarnhost snapshot restore base
+  $ tarnhost dump | cmp - base.json && jq -r .event t.json
+  open
+  end
   $ tarnhost diff base && tarnhost diff after base | head -1
   + pnic pnic3
   $ tarnhost snapshot restore gone; echo "status $?"
   tarnhost: No snapshot named gone (tarnhost snapshot list lists them)
   status 1
+
+A damaged snapshot, or a file that is not one, is refused before the host is
+touched.
+
+  $ cp host.db.snapshots/after host.db.snapshots/bad
+  $ printf '\377\377\377\377' | dd of=host.db.snapshots/bad bs=1 seek=4097 conv=notrunc 2>/dev/null
+  $ tarnhost snapshot restore bad; echo "status $?"
+  tarnhost: Host database */host.db: */host.db.snapshots/bad is damaged (Page 2: btreeInitPage() returns error code 11); the host was not changed (glob)
+  status 1
+  $ echo x > host.db.snapshots/bad && tarnhost snapshot restore bad 2>&1 | sed 's|^.*/bad|bad|'
+  bad (file is not a database); the host was not changed
+  $ tarnhost diff base && tarnhost snapshot del bad
   $ tarnhost snapshot save a/b 2>&1; tarnhost snapshot save '' 2>&1 | head -1
   tarnhost: snapshot name a/b contains '/' (a name is 1 to 64 bytes without '/' or a control character, not starting with '.')
   usage: tarnhost snapshot save NAME

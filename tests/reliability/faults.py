@@ -18,8 +18,9 @@ committed (after, not 0), lost (before, 0), corrupt (does not open, not
 intact, or neither host) or unclear (its message); the last three fail.
 
 usage: faults.py BIN_DIR [--full] [--every K]
-  default: every write and sync of -A and client add, every stat of -A,
-           every write and read of tarnhost init on a missing file
+  default: every write and sync of -A, client add and snapshot restore,
+           every stat of -A, every write and read of tarnhost init on a
+           missing file
   --full:  every command, every call, every fault
   --every K: only occurrences 1, 1+K, 1+2K, ... and the last
 """
@@ -73,6 +74,9 @@ def commands(host, work):
          [[th, "init"], [tool, "-A", "Loaded", "vswitch0"], ("dump", dump),
           [tool, "-D", "Loaded", "vswitch0"], [tool, "-a", "vSwitchX"]], dump),
         ("-l", [tool, "-l"], [[th, "init"], [tool, "-a", "vSwitchX"]], None),
+        ("snapshot restore", [th, "snapshot", "restore", "base"],
+         [[th, "init"], [th, "snapshot", "save", "base"], [tool, "-A", "Extra", "vswitch0"],
+          [th, "pnic", "add", "pnic7"]], None),
     ]
 
 
@@ -106,7 +110,10 @@ class Fixture:
         """A copy of the prepared host in a new directory: the path of its file."""
         run = tempfile.mkdtemp(prefix=label + ".", dir=root)
         for f in os.listdir(self.prep):
-            shutil.copy(os.path.join(self.prep, f), run)
+            if os.path.isdir(os.path.join(self.prep, f)):
+                shutil.copytree(os.path.join(self.prep, f), os.path.join(run, f))
+            else:
+                shutil.copy(os.path.join(self.prep, f), run)
         return os.path.join(run, "host.db")
 
     def state(self, db):
@@ -127,7 +134,8 @@ class Fixture:
     def strace(self, db, call, extra):
         argv = ["strace", "-f", "-o", "/dev/null"] if extra else ["strace", "-f"]
         if any(c in ON_HOST_PATHS for c in call.split(",")):
-            for p in [db, db + "-wal", db + "-journal", os.path.dirname(db), self.input_file]:
+            for p in [db, db + "-wal", db + "-journal", os.path.dirname(db), self.input_file,
+                      db + ".snapshots/base"]:
                 if p:
                     argv += ["-P", p]
         return argv + ["-e", f"trace={call}"] + extra + ["--"] + self.argv
@@ -205,7 +213,7 @@ def main():
         plan = [(c, list(GROUP_OF)) for c in chosen]
     else:
         ci = {"-A": ["write", "sync", "stat"], "client add": ["write", "sync"],
-              "init missing": ["write", "read"]}
+              "init missing": ["write", "read"], "snapshot restore": ["write", "sync"]}
         plan = [(c, [call for g in ci[c[0]] for call in GROUPS[g]]) for c in chosen if c[0] in ci]
 
     jobs, setup = [], []
@@ -230,7 +238,7 @@ def main():
         if cls in BAD:
             (firsts if row[cls] == 1 else others).append(
                 f"{fx.name}: {call} {fault} at {k}: {cls}: {why}\n  {repro}")
-    width = 16
+    width = 18
     lines = [f"{'command':<{width}}{'call':<12}{'fault':<8}{'runs':>6}"
              + "".join(f"{c:>11}" for c in CLASSES)]
     for (name, call, fault), row in table.items():

@@ -50,4 +50,8 @@ void Host::Commit() {
   session_->Commit();
 }
 
+void Host::ReplaceWith(const std::string& file) {
+  session_->ReplaceHost(file);
+}
+
 }  // namespace TarnCtl::Admin

@@ -54,6 +54,8 @@ class Host {
   const std::string& Path() const;
   // Makes what was done so far durable; throws when it cannot.
   void Commit();
+  // Commits, and makes the host the host file `file` (a snapshot).
+  void ReplaceWith(const std::string& file);
 
  private:
   explicit Host(std::shared_ptr<Api::Session> session);

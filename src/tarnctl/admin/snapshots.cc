@@ -8,11 +8,10 @@
 #include <cerrno>
 #include <cstring>
 
-#include "tarnctl/admin/dump/catalogue.h"
+#include "tarnctl/admin/host.h"
 #include "tarnctl/instrument/call.h"
 #include "tarnctl/instrument/errors.h"
 #include "tarnctl/store/db.h"
-#include "tarnctl/store/transaction.h"
 
 namespace TarnCtl::Admin {
 
@@ -86,15 +85,10 @@ void SaveSnapshot(Store::Db& db, const std::string& hostPath, const std::string&
   CopyHost(db, FileOf(hostPath, name));
 }
 
-void RestoreSnapshot(Store::Db& db, const std::string& hostPath, const std::string& name) {
-  const std::string file = Existing(hostPath, name);
-  Instrument::Scope scope(db, "Restore");
-  std::vector<std::string> tables;
-  for (const auto& table : Dump::Tables()) tables.push_back(table.name);
-  db.PrepareBulkChange();
-  Store::Transaction transaction(db);
-  db.CopyTablesFrom(file, tables);
-  transaction.Commit();
+void RestoreSnapshot(Host& host, const std::string& name) {
+  const std::string file = Existing(host.Path(), name);
+  Instrument::Scope scope(host.db(), "Restore");
+  host.ReplaceWith(file);
 }
 
 void RemoveSnapshot(const std::string& hostPath, const std::string& name) {

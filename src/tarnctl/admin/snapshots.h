@@ -1,7 +1,7 @@
 // Snapshots: named copies of a whole host, kept in a folder beside its file
 // (PATH.snapshots/NAME), each a host file by itself. Saved and restored
-// under the host's lock; a restore replaces every table of the host, in the
-// caller's transaction, as a load does.
+// under the host's lock; a restore copies the snapshot's pages over the
+// host's, in one commit.
 #pragma once
 
 #include <memory>
@@ -13,6 +13,8 @@ class Db;
 }
 
 namespace TarnCtl::Admin {
+
+class Host;
 
 // Snapshot names: 1 to kSnapshotNameMax bytes, no '/', no control
 // character, not starting with '.'.
@@ -29,8 +31,9 @@ bool HasSnapshot(const std::string& hostPath, const std::string& name);
 // Keeps the host open in `db` as snapshot `name` (replacing one of that
 // name).
 void SaveSnapshot(Store::Db& db, const std::string& hostPath, const std::string& name);
-// Replaces the whole host in `db` with snapshot `name`.
-void RestoreSnapshot(Store::Db& db, const std::string& hostPath, const std::string& name);
+// Makes `host` snapshot `name` again, in one commit of its own after what
+// the host's run did so far.
+void RestoreSnapshot(Host& host, const std::string& name);
 void RemoveSnapshot(const std::string& hostPath, const std::string& name);
 // Snapshot `name`, opened to be read only.
 std::unique_ptr<Store::Db> OpenSnapshot(const std::string& hostPath, const std::string& name);

@@ -72,6 +72,17 @@ void Session::Commit() {
   run_.emplace(host_->db());
 }
 
+void Session::ReplaceHost(const std::string& file) {
+  Commit();
+  // The copy commits by itself, outside the run.
+  run_.reset();
+  struct Resume {
+    Session& session;
+    ~Resume() { session.run_.emplace(session.host_->db()); }
+  } resume{*this};
+  host_->db().ReplaceWith(file);
+}
+
 Store::Location Session::DefaultLocation() {
   return Store::ResolveLocation(Store::ProcessEnvironment());
 }

@@ -59,6 +59,9 @@ class Session {
   // Commits the run so far and goes on in a new transaction. A failed
   // commit throws what it met, and the session commits nothing more.
   void Commit();
+  // Commits the run so far, then makes the host the database file `file`
+  // (Store::Db::ReplaceWith), and goes on in a new transaction.
+  void ReplaceHost(const std::string& file);
 
  private:
   Session(Store::Location location, std::unique_ptr<Store::HostFile> host);

@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <cassert>
 #include <cerrno>
 #include <cstring>
 
@@ -15,8 +16,6 @@ namespace TarnCtl::Store {
 
 namespace {
 
-// The name the copied file is attached under while its rows are read.
-constexpr const char* kCopied = "copied";
 // Where a database file's header keeps its format's write and read versions.
 constexpr off_t kFormatVersionsOffset = 18;
 
@@ -95,39 +94,41 @@ void Db::CopyTo(const std::string& file) {
   }
 }
 
-void Db::CopyTablesFrom(const std::string& file, const std::vector<std::string>& tables) {
-  // A file attached by an earlier call whose transaction has ended.
-  if (sqlite3_db_filename(handle_, kCopied) != nullptr) {
-    Exec(std::string("DETACH ") + kCopied);
+void Db::ReplaceWith(const std::string& file) {
+  assert(depth_ == 0 && !InTransaction());
+  const std::string unchanged = "; the host was not changed";
+  // The host's lock keeps its snapshots as they are while it is held.
+  std::unique_ptr<Db> copy;
+  std::string id, version, check;
+  try {
+    copy = OpenFile(file, file, Access::kRead);
+    auto pragma = [&](const char* name) {
+      auto statement = copy->Prepare(std::string("PRAGMA ") + name);
+      return statement.Step() ? statement.Text(0) : std::string();
+    };
+    id = pragma("application_id");
+    version = pragma("user_version");
+    // Pages are copied as they are: a damaged page would become the host's.
+    if (id == std::to_string(kApplicationId)) check = pragma("quick_check");
+    // The first problem, without the line naming the database ("*** in
+    // database main ***") that comes before it.
+    if (check.rfind("***", 0) == 0) check.erase(0, check.find('\n') + 1);
+  } catch (const DbFailure& failure) {
+    throw Error("cannot read " + file + " (" + failure.cause() + ")" + unchanged);
   }
-  // Run here rather than prepared through the statement cache: these name
-  // a database that only this call attaches.
-  sqlite3_stmt* statement = nullptr;
-  auto step = [&](const std::string& sql, const std::string* text) {
-    int64_t value = -1;
-    if (sqlite3_prepare_v2(handle_, sql.c_str(), -1, &statement, nullptr) != SQLITE_OK) Fail();
-    if (text != nullptr) sqlite3_bind_text(statement, 1, text->c_str(), -1, SQLITE_STATIC);
-    const int rc = sqlite3_step(statement);
-    if (rc == SQLITE_ROW) value = sqlite3_column_int64(statement, 0);
-    sqlite3_finalize(statement);
-    if (rc != SQLITE_ROW && rc != SQLITE_DONE) Fail();
-    return value;
-  };
-  step(std::string("ATTACH ?1 AS ") + kCopied, &file);
-  // Read through a mapping: no system call a page.
-  Exec(std::string("PRAGMA ") + kCopied + ".mmap_size=1073741824");
-  auto pragma = [&](const char* name) {
-    return step(std::string("PRAGMA ") + kCopied + "." + name, nullptr);
-  };
-  if (pragma("application_id") != kApplicationId || pragma("user_version") != kSchemaVersion) {
+  if (id != std::to_string(kApplicationId) || version != std::to_string(kSchemaVersion)) {
     throw Error(file + " is not a copy of a host of schema version " +
-                std::to_string(kSchemaVersion));
+                std::to_string(kSchemaVersion) + unchanged);
   }
-  // Same tables, same columns: SQLite copies the rows as they are stored.
-  for (const std::string& table : tables) {
-    Exec("DELETE FROM main." + table + "; INSERT INTO main." + table + " SELECT * FROM " + kCopied +
-         "." + table);
-  }
+  if (check != "ok") throw Error(file + " is damaged (" + check + ")" + unchanged);
+  sqlite3_backup* backup = sqlite3_backup_init(handle_, "main", copy->handle_, "main");
+  if (backup == nullptr) FailNotMade();
+  const int rc = sqlite3_backup_step(backup, -1);
+  // Leaves the step's failure, if any, as this connection's last one.
+  sqlite3_backup_finish(backup);
+  if (rc != SQLITE_DONE) FailNotMade();
+  ++replacements_;
+  CopyCommitIn();
 }
 
 }  // namespace TarnCtl::Store

@@ -338,7 +338,7 @@ std::string Db::Cause() const {
 }
 
 int64_t Db::ChangeCount() const {
-  return sqlite3_total_changes64(handle_);
+  return sqlite3_total_changes64(handle_) + replacements_;
 }
 
 int64_t Db::LastChanges() const {
@@ -352,6 +352,27 @@ DbError Db::Error(const std::string& cause) const {
 void Db::Fail(const std::string& more) const {
   const std::string cause = Cause();
   throw DbFailure(Error(cause + more), LastFailure(), cause);
+}
+
+void Db::FailNotMade() const {
+  const bool full = LastFailure() == Failure::kFull;
+  Fail(std::string("; the change was not made") + (full ? " (free space, then run it again)" : ""));
+}
+
+void Db::CopyCommitIn() {
+  copyFailed_ = CopyLogIn(handle_);
+  if (copyFailed_ != SQLITE_OK) throw WaitingInLog(copyFailed_);
+}
+
+DbFailure Db::WaitingInLog(int copyFailed) const {
+  const bool full = FailureOf(copyFailed) == Failure::kFull;
+  const std::string cause = full ? "database or disk is full" : "disk I/O error";
+  return DbFailure(Error("the change was made, but copying it from the log into the host file "
+                         "failed (" +
+                         cause + "): it waits in " + sqlite3_db_filename(handle_, "main") +
+                         "-wal, and the next program to open the host copies it in" +
+                         (full ? " (free space first)" : "")),
+                   FailureOf(copyFailed), cause);
 }
 
 Statement Keyed(Db& db, const std::string& sql, int64_t layer, const std::string& name) {
@@ -403,19 +424,8 @@ void Transaction::Commit() {
       done_ = true;
     }
     if (depth_ > 0) db_.Fail();
-    if (open || db_.copyFailed_ == 0) {
-      const bool full = db_.LastFailure() == Db::Failure::kFull;
-      db_.Fail(std::string("; the change was not made") +
-               (full ? " (free space, then run it again)" : ""));
-    }
-    const bool full = FailureOf(db_.copyFailed_) == Db::Failure::kFull;
-    const std::string cause = full ? "database or disk is full" : "disk I/O error";
-    throw DbFailure(db_.Error("the change was made, but copying it from the log into the host "
-                              "file failed (" +
-                              cause + "): it waits in " + sqlite3_db_filename(db_.handle_, "main") +
-                              "-wal, and the next program to open the host copies it in" +
-                              (full ? " (free space first)" : "")),
-                    FailureOf(db_.copyFailed_), cause);
+    if (open || db_.copyFailed_ == 0) db_.FailNotMade();
+    throw db_.WaitingInLog(db_.copyFailed_);
   }
   db_.depth_ = depth_;
   done_ = true;

@@ -140,10 +140,13 @@ class Db {
   // waits in the log, or once the open transaction changed anything (the
   // copy would miss it).
   void CopyTo(const std::string& file);
-  // Replaces every row of `tables` with the rows of the same tables of the
-  // file `file`, a copy that CopyTo made of a host of this schema version,
-  // inside the caller's transaction. Refuses another file.
-  void CopyTablesFrom(const std::string& file, const std::vector<std::string>& tables);
+  // Makes the host the database file `file`, a copy that CopyTo made of a
+  // host of this schema version, page by page in one commit of its own,
+  // copied into the file as every commit is. Refuses another file and a
+  // damaged one, leaving the host as it was. Counts as a change of every
+  // row (ChangeCount() moves on).
+  // REQUIRES: no transaction is open (the copy commits by itself).
+  void ReplaceWith(const std::string& file);
 
   Statement Prepare(const std::string& sql);
   // Runs SQL without results (several statements allowed).
@@ -198,6 +201,14 @@ class Db {
   friend class Statement;
   friend class Transaction;
   Db(sqlite3* handle, std::string path);
+  // Throws the last failure as that of a change that was not made.
+  [[noreturn]] void FailNotMade() const;
+  // Copies what the last commit left in the log into the file, as the
+  // commit hook does; throws WaitingInLog() when that fails.
+  void CopyCommitIn();
+  // The failure of a commit that stands but whose copy from the log into
+  // the file failed with SQLite code `copyFailed`.
+  DbFailure WaitingInLog(int copyFailed) const;
 
   sqlite3* handle_;
   std::string path_;
@@ -210,6 +221,7 @@ class Db {
   // The copy of the log into the file after the last commit failed with
   // this SQLite code (0: it did not fail); set by the commit hook.
   int copyFailed_ = 0;
+  int64_t replacements_ = 0;  // ReplaceWith() calls, which SQLite counts no change of
   struct Cache;
   std::unique_ptr<Cache> cache_;
 };
