@@ -138,8 +138,7 @@ TEST_F(DiffTest, SnapshotsComeBackWholeAndAreNamedWithCare) {
     Host host;
     RestoreSnapshot(host, "base");
     EXPECT_EQ(DumpHost(host.db()), saved);
-    EXPECT_EQ(Refusal([&] { RestoreSnapshot(host, "nope"); }),
-              "No snapshot named nope");
+    EXPECT_EQ(Refusal([&] { RestoreSnapshot(host, "nope"); }), "No snapshot named nope");
     RemoveSnapshot(path_, "base");
     EXPECT_TRUE(Snapshots(path_).empty());
   }
