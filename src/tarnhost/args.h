@@ -41,6 +41,7 @@ enum class Kind {
   Showable,  // what show NAME shows: switch, port group, DVS:PORTID
   Fault,     // the number of an armed fault
   Snapshot,  // the name of a snapshot of the host
+  State,     // a snapshot's name or a file (- for standard input)
 };
 
 struct OptionDef {

@@ -58,6 +58,7 @@ Words Candidates(Kind kind, const Words& given) {
     case Kind::Operation:
       return FaultOperationNames();
     case Kind::Snapshot:
+    case Kind::State:
       return TarnCtl::Admin::Snapshots(TarnCtl::Admin::HostPath());
     default:
       for (const auto& host : kHostKinds) {
@@ -160,7 +161,10 @@ int Complete(const Args& args) {
   const ArgumentDef* def = given.size() < defs.size()             ? &defs[given.size()]
                            : !defs.empty() && defs.back().repeats ? &defs.back()
                                                                   : nullptr;
-  if (def && def->kind == Kind::File) return Offer("files", {}, current);
+  // Files, which the shell finds, and the words that can stand for one.
+  if (def && (def->kind == Kind::File || def->kind == Kind::State)) {
+    return Offer("files", Candidates(def->kind, given), current);
+  }
   if (!def) return Offer("words", {}, current);
   return OfferValue(def->kind, given, current);
 }

@@ -87,7 +87,7 @@ const std::vector<Command>& Commands() {
                "whole and the host stays as it was.",
        .run = Load},
       {.words = {"diff"},
-       .syntax = {.arguments = {{"A", Kind::File, true}, {"B", Kind::File, true}},
+       .syntax = {.arguments = {{"A", Kind::State, true}, {"B", Kind::State, true}},
                   .options = {{.name = "layers",
                                .help = "the stored configuration against the running state"},
                               {.name = "json", .help = "as a JSON array of records"}}},
@@ -114,7 +114,8 @@ const std::vector<Command>& Commands() {
       {.words = {"snapshot", "restore"},
        .syntax = {.arguments = {{"NAME", Kind::Snapshot}}},
        .summary = "replace the host with a snapshot",
-       .help = "In one transaction, as a load: faults and events become the snapshot's too.",
+       .help = "In one commit: faults and events become the snapshot's too. A damaged snapshot, "
+               "or one of another version, is refused and the host left as it was.",
        .run = RestoreSnapshot},
       {.words = {"snapshot", "list"},
        .summary = "list the snapshots of the host",

@@ -281,14 +281,17 @@ without making a host: a busy or missing host offers none.
 A name with a space is offered as it must be typed, however its start was
 quoted, by both programs; so are file names:
 
-  $ orvocfg-vswitch -A 'Guest Network' vswitch0; touch 'my dump.json'
+  $ orvocfg-vswitch -A 'Guest Network' vswitch0; touch 'my dump.json'; tarnhost snapshot save 'my base'
   $ t() { bash -c 'source "$0"; COMP_WORDS=(tarnhost "$@"); COMP_CWORD=$#; _tarnhost
   >   printf "[%s]" "${COMPREPLY[@]}"; echo' "$TESTDIR/../../completions/tarnhost" "$@"; }
-  $ t client add G; t client add 'Guest\ N'; t client add "'Gu"; t load my
+  $ t client add G; t client add 'Guest\ N'; t client add "'Gu"; t load my; t diff my; t diff x y
   [Guest\ Network]
   [Guest\ Network]
   [Guest\ Network]
   [my dump.json]
+  [my dump.json][my base]
+  []
+  $ tarnhost snapshot del 'my base'
   $ o -p G; o --pg='"Gu'; o -D 'Guest\ '
   Guest\ Network
   --pg=Guest\ Network
