@@ -4,10 +4,10 @@
 #include <vector>
 
 #include "hostctl/exception.h"
+#include "hostctl/join.h"
 #include "listing/layouts.h"
 #include "listing/listing.h"
 #include "listing/table.h"
-#include "listing/text.h"
 
 namespace Listing {
 
@@ -40,7 +40,7 @@ void ListDVSwitch(HostCtl::Network::DVSwitch& dvs) {
     row.Field(dvs.GetUsedPorts());
     row.Field(dvs.GetConfiguredPorts());
     row.Field(dvs.GetMTU());
-    row.Field(HostCtl::Misc::VectorToString(dvs.GetUplinks(), ","));
+    row.Field(HostCtl::Text::Join(dvs.GetUplinks(), ","));
     row.End();
 
     PrintEmptyLine(std::cout);

@@ -2,10 +2,10 @@
 #include <iostream>
 
 #include "hostctl/exception.h"
+#include "hostctl/join.h"
 #include "listing/layouts.h"
 #include "listing/listing.h"
 #include "listing/table.h"
-#include "listing/text.h"
 
 namespace Listing {
 
@@ -17,7 +17,7 @@ void ListOpaqueSwitch(HostCtl::Network::DVSwitch& sw) {
     row.Field(kGap);
     row.Field(sw.GetNumPorts());
     row.Field(sw.GetUsedPorts());
-    row.Field(HostCtl::Misc::VectorToString(sw.GetUplinks(), ","));
+    row.Field(HostCtl::Text::Join(sw.GetUplinks(), ","));
     row.End();
     PrintEmptyLine(std::cout);
   } catch (const HostCtl::Lib::HostCtlException& e) {

@@ -4,10 +4,10 @@
 #include <string>
 
 #include "hostctl/exception.h"
+#include "hostctl/join.h"
 #include "listing/layouts.h"
 #include "listing/listing.h"
 #include "listing/table.h"
-#include "listing/text.h"
 
 namespace Listing {
 
@@ -44,7 +44,7 @@ void ListPortGroup(HostCtl::Network::PortGroup& group) {
   const std::size_t usedPorts = group.GetPorts().size();
   const NicTeamingPolicy policy = group.GetTeamingPolicy();
   const std::string uplinks = (policy.flags & NicTeamingPolicy::kUplinkOrderSet) != 0
-                                  ? HostCtl::Misc::VectorToString(policy.uplinkOrder, ",")
+                                  ? HostCtl::Text::Join(policy.uplinkOrder, ",")
                                   : std::string();
   RowWriter row(std::cout, kPortGroupLayout);
   row.Field(kGap);
@@ -70,7 +70,7 @@ void ListVirtualSwitch(HostCtl::Network::VirtualSwitch& sw) {
     row.Field(sw.GetUsedPorts());
     row.Field(sw.GetConfiguredPorts());
     row.Field(sw.GetMTU());
-    row.Field(HostCtl::Misc::VectorToString(policy.uplinkOrder, ","));
+    row.Field(HostCtl::Text::Join(policy.uplinkOrder, ","));
     row.End();
 
     PrintEmptyLine(std::cout);

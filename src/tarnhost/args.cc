@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <charconv>
 
+#include "hostctl/edit_distance.h"
+
 namespace TarnHost {
 
 const OptionDef* Syntax::Option(const std::string& name) const {
@@ -17,23 +19,22 @@ std::string OptionDef::Usage() const {
 }
 
 std::string Syntax::Synopsis() const {
-  std::string text;
-  auto add = [&](const std::string& part) { text += (text.empty() ? "" : " ") + part; };
+  std::vector<std::string> parts;
   auto addArguments = [&] {
     for (const auto& a : arguments) {
       const std::string name = std::string(a.name) + (a.repeats ? "..." : "");
-      add(a.optional ? "[" + name + "]" : name);
+      parts.push_back(a.optional ? "[" + name + "]" : name);
     }
   };
   if (!rest) addArguments();
   for (const auto& o : options) {
-    add("[" + o.Usage() + "]" + (o.repeatable ? "..." : ""));
+    parts.push_back("[" + o.Usage() + "]" + (o.repeatable ? "..." : ""));
   }
   if (rest) {
-    add("--");
+    parts.push_back("--");
     addArguments();
   }
-  return text;
+  return Join(parts, " ");
 }
 
 bool IsOptionWord(const std::string& word) {
@@ -42,12 +43,6 @@ bool IsOptionWord(const std::string& word) {
 
 bool IsHelpWord(const std::string& word) {
   return word == "-h" || word == "--help";
-}
-
-std::string Join(const std::vector<std::string>& words, const char* separator) {
-  std::string text;
-  for (const auto& w : words) text += (text.empty() ? "" : separator) + w;
-  return text;
 }
 
 Tokens Tokenize(const std::vector<std::string>& words, const Syntax& syntax) {
@@ -124,10 +119,9 @@ Args::Args(const std::vector<std::string>& words, const Syntax& syntax,
   const size_t required =
       std::count_if(defs.begin(), defs.end(), [](const ArgumentDef& a) { return !a.optional; });
   if (positional_.size() < required) {
-    std::string missing = "missing";
-    for (size_t k = positional_.size(); k < required; ++k)
-      missing += " " + std::string(defs[k].name);
-    throw UsageError(missing);
+    std::vector<const char*> missing;
+    for (size_t k = positional_.size(); k < required; ++k) missing.push_back(defs[k].name);
+    throw UsageError("missing " + Join(missing, " "));
   }
   if (positional_.size() > defs.size() && (defs.empty() || !defs.back().repeats)) {
     throw UsageError("unexpected argument " + positional_[defs.size()]);
@@ -165,23 +159,6 @@ T ParseDecimal(const std::string& text, const std::string& what) {
   return value;
 }
 
-// Edits (insertion, deletion, substitution, swap of neighbours) from a to b.
-size_t Distance(const std::string& a, const std::string& b) {
-  std::vector<std::vector<size_t>> d(a.size() + 1, std::vector<size_t>(b.size() + 1));
-  for (size_t i = 0; i <= a.size(); ++i) d[i][0] = i;
-  for (size_t j = 0; j <= b.size(); ++j) d[0][j] = j;
-  for (size_t i = 1; i <= a.size(); ++i) {
-    for (size_t j = 1; j <= b.size(); ++j) {
-      d[i][j] = std::min(
-          {d[i - 1][j] + 1, d[i][j - 1] + 1, d[i - 1][j - 1] + (a[i - 1] == b[j - 1] ? 0 : 1)});
-      if (i > 1 && j > 1 && a[i - 1] == b[j - 2] && a[i - 2] == b[j - 1]) {
-        d[i][j] = std::min(d[i][j], d[i - 2][j - 2] + 1);
-      }
-    }
-  }
-  return d[a.size()][b.size()];
-}
-
 }  // namespace
 
 int32_t ParseInt32(const std::string& text, const std::string& what) {
@@ -216,9 +193,11 @@ std::vector<std::string> Nearest(const std::string& word,
     }
     if (!nearest.empty()) return nearest;
   }
-  size_t best = word.size() <= 4 ? 1 : 2;  // more edits than that is another word
+  // More edits than one (two in a longer word) is another word; the
+  // distance counts halves.
+  size_t best = word.size() <= 4 ? 2 : 4;
   for (const auto& c : candidates) {
-    const size_t d = Distance(word, c);
+    const size_t d = HostCtl::Text::EditDistance(word, c);
     if (d < best) nearest.clear();
     if (d <= best) {
       best = d;
@@ -230,15 +209,9 @@ std::vector<std::string> Nearest(const std::string& word,
 
 std::string DidYouMean(const std::string& word, const std::vector<std::string>& candidates,
                        const std::string& before) {
-  const auto nearest = Nearest(word, candidates);
-  std::string text;
-  for (size_t i = 0; i < nearest.size(); ++i) {
-    text += (i == 0                    ? "; did you mean "
-             : i + 1 == nearest.size() ? " or "
-                                       : ", ") +
-            before + nearest[i];
-  }
-  return text.empty() ? text : text + "?";
+  std::vector<std::string> named;
+  for (const auto& n : Nearest(word, candidates)) named.push_back(before + n);
+  return named.empty() ? "" : "; did you mean " + Join(named, ", ", " or ") + "?";
 }
 
 }  // namespace TarnHost

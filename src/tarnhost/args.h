@@ -12,7 +12,11 @@
 #include <string>
 #include <vector>
 
+#include "hostctl/join.h"
+
 namespace TarnHost {
+
+using HostCtl::Text::Join;
 
 struct UsageError : std::runtime_error {
   using std::runtime_error::runtime_error;
@@ -121,8 +125,6 @@ class Args {
 bool IsOptionWord(const std::string& word);
 // -h or --help.
 bool IsHelpWord(const std::string& word);
-// The words with `separator` between them.
-std::string Join(const std::vector<std::string>& words, const char* separator = " ");
 
 // Decimal digits only, no sign or blanks, within the type's range.
 int32_t ParseInt32(const std::string& text, const std::string& what);

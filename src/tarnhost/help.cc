@@ -71,7 +71,7 @@ void PrintHelp(const std::vector<const Command*>& commands, std::FILE* stream) {
       text += Columns("  " + names[i], c->syntax.options[i].help, width + 4);
     }
     Words also;
-    for (const auto& spelling : c->also) also.push_back(Join(spelling));
+    for (const auto& spelling : c->also) also.push_back(Join(spelling, " "));
     if (!also.empty()) text += Wrap("Also spelled: " + Join(also, ", ") + ".", 2);
     std::fputs(text.c_str(), stream);
   }

@@ -53,7 +53,7 @@ std::vector<Words> Spellings(const Command& c) {
 }  // namespace
 
 std::string Command::Name() const {
-  return Join(words);
+  return Join(words, " ");
 }
 
 const std::vector<Command>& Commands() {
@@ -436,7 +436,7 @@ size_t KnownPrefix(const Words& words) {
   const size_t known = KnownPrefix(words);
   const Words prefix(words.begin(), words.begin() + known);
   const Words next = NextWords(prefix);
-  const std::string before = known == 0 ? "" : Join(prefix) + " ";
+  const std::string before = known == 0 ? "" : Join(prefix, " ") + " ";
   if (known == words.size()) {
     throw CommandError(std::string("missing ") + (known == 1 ? "verb" : "word") + " after " +
                            before + "(" + Join(next, ", ") + ")",

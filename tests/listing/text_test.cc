@@ -1,23 +1,53 @@
-// The text helpers: list joining and the UUID text form.
+// The text helpers: list joining, the edit distance and the UUID text form.
 #include <gtest/gtest.h>
 
 #include <string>
 #include <vector>
 
+#include "hostctl/edit_distance.h"
+#include "hostctl/join.h"
 #include "hostctl/uuid_text.h"
-#include "listing/text.h"
 
 namespace {
 
-using HostCtl::Misc::VectorToString;
+using HostCtl::Text::EditDistance;
 using HostCtl::Text::IsValidUuidString;
+using HostCtl::Text::Join;
 using HostCtl::Text::UuidToString;
 
-TEST(VectorToString, JoinsWithoutTrailingSeparator) {
-  using Names = std::vector<std::string>;
-  EXPECT_EQ(VectorToString(Names{}, ","), "");
-  EXPECT_EQ(VectorToString(Names{"a", "b"}, ", "), "a, b");
-  EXPECT_EQ(VectorToString(Names{"a", "b"}, nullptr), "a");
+// An empty item keeps its place.
+TEST(Join, PutsSeparatorsBetweenItemsOnly) {
+  const struct {
+    std::vector<std::string> items;
+    const char* joined;
+    const char* alternatives;
+  } cases[] = {{{}, "", ""},
+               {{"a"}, "a", "a"},
+               {{"a", "b"}, "a,b", "a or b"},
+               {{"a", "b", "c"}, "a,b,c", "a, b or c"},
+               {{"", "b", ""}, ",b,", ", b or "}};
+  for (const auto& c : cases) {
+    EXPECT_EQ(Join(c.items, ","), c.joined);
+    EXPECT_EQ(Join(c.items, ", ", " or "), c.alternatives);
+  }
+}
+
+// In halves: a change of case is 1, any other edit (a swap of neighbours
+// too) 2; the same both ways.
+TEST(EditDistance, CountsEditsInHalves) {
+  const struct {
+    const char* a;
+    const char* b;
+    size_t halves;
+  } cases[] = {
+      {"dump", "dump", 0}, {"SetVlanID", "SetVlanId", 1}, {"getmtu", "GetMTU", 4},
+      {"dumo", "dump", 2}, {"verison", "version", 2},     {"RemoveUplnk", "RemoveUplink", 2},
+      {"", "add", 6},
+  };
+  for (const auto& c : cases) {
+    EXPECT_EQ(EditDistance(c.a, c.b), c.halves) << c.a << " " << c.b;
+    EXPECT_EQ(EditDistance(c.b, c.a), c.halves) << c.b << " " << c.a;
+  }
 }
 
 // What it writes, IsValidUuidString accepts.

@@ -116,13 +116,12 @@ std::vector<Json> Records(const Timeouts& timeouts, const char* key) {
   return json[key].get<std::vector<Json>>();
 }
 std::string RecordName(const Json& record) {
-  std::string name;
-  for (const auto& [key, value] : record.items()) {
-    if (key == "timeout") continue;
-    name +=
-        (name.empty() ? "" : " ") + (value.is_string() ? value.get<std::string>() : value.dump());
+  std::vector<std::string> key;
+  for (const auto& [field, value] : record.items()) {
+    if (field == "timeout") continue;
+    key.push_back(value.is_string() ? value.get<std::string>() : value.dump());
   }
-  return name;
+  return Join(key, " ");
 }
 
 // The layered kinds, each from the reading of `a` in `layerA` to that of `b`
@@ -238,16 +237,16 @@ std::string Shown(const Json& value) {
   if (value.is_string()) return value.get<std::string>();
   if (value.is_array()) {
     if (value.empty()) return "(none)";
-    std::string text;
-    for (const Json& item : value) text += (text.empty() ? "" : ",") + Shown(item);
-    return text;
+    std::vector<std::string> items;
+    for (const Json& item : value) items.push_back(Shown(item));
+    return Join(items, ",");
   }
   if (value.is_object() && !value.contains("hex")) {
-    std::string text;
+    std::vector<std::string> values;
     for (const auto& [key, item] : value.items()) {
-      if (!item.is_null()) text += (text.empty() ? "" : ":") + Shown(item);
+      if (!item.is_null()) values.push_back(Shown(item));
     }
-    return text;
+    return Join(values, ":");
   }
   return value.dump(-1, ' ', false, Json::error_handler_t::replace);
 }
@@ -280,10 +279,9 @@ std::string DiffText(const std::vector<Difference>& differences) {
     std::string tag;
     if (!layers.empty()) {
       std::sort(layers.begin(), layers.end(), std::greater<>());  // running first
-      tag = " [";
-      for (size_t i = 0; i < layers.size(); ++i)
-        tag += (i ? ", " : "") + std::string(LayerName(layers[i]));
-      tag += "]";
+      std::vector<const char*> names;
+      for (const Layer layer : layers) names.push_back(LayerName(layer));
+      tag = " [" + Join(names, ", ") + "]";
     }
     const auto tab = line.find('\t');
     if (tab == std::string::npos) {

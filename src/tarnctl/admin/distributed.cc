@@ -71,7 +71,7 @@ std::vector<ListRow> ListDVSwitches(Store::Db& db) {
     std::vector<std::string> pnics;
     for (const auto& uplink : dvs.uplinks) pnics.push_back(uplink.pnic);
     rows.push_back({dvs.name, dvs.row.portset, dvs.row.switchId, std::to_string(dvs.row.numPorts),
-                    std::to_string(Store::Distributed::UsedPorts(db, dvs.name)), Commas(pnics)});
+                    std::to_string(Store::Distributed::UsedPorts(db, dvs.name)), Join(pnics, ",")});
   }
   return rows;
 }

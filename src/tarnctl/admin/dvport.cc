@@ -109,7 +109,7 @@ std::vector<ListRow> ListDVPorts(Store::Db& db) {
         if (uplink.portId == port.portId) pnics.push_back(uplink.pnic);
       }
     }
-    ListRow row{port.dvs, port.portId, std::to_string(port.connectionId), Commas(pnics)};
+    ListRow row{port.dvs, port.portId, std::to_string(port.connectionId), Join(pnics, ",")};
     for (auto& client : port.clients) row.push_back(std::move(client));
     rows.push_back(std::move(row));
   }

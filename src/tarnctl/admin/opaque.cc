@@ -49,7 +49,7 @@ std::vector<ListRow> ListOpaqueSwitches(Store::Db& db) {
   std::vector<ListRow> rows;
   for (const auto& sw : OpaqueSwitches(db)) {
     rows.push_back({sw.name, sw.row.portset, std::to_string(sw.row.numPorts),
-                    std::to_string(sw.row.usedPorts), Commas(sw.row.uplinks)});
+                    std::to_string(sw.row.usedPorts), Join(sw.row.uplinks, ",")});
   }
   return rows;
 }

@@ -17,12 +17,14 @@
 #include <string>
 #include <vector>
 
+#include "hostctl/join.h"
 #include "tarnctl/admin/show_json.h"
 #include "tarnctl/admin/whole_host.h"
 
 namespace TarnCtl::Admin {
 namespace {
 
+using HostCtl::Text::Join;
 using Store::Json;
 
 constexpr const char* kLayerKeys[] = {"running", "stored"};
@@ -127,16 +129,16 @@ class Graph {
       return item.labels.begin()->second;
     }
     const auto a = Lines(running->second), b = Lines(stored->second);
-    std::string out;
+    std::vector<std::string> lines;
     for (size_t i = 0; i < std::max(a.size(), b.size()); ++i) {
       const std::string mine = i < a.size() ? a[i] : "";
       std::string line = mine;
       if (i >= a.size() || i >= b.size() || a[i] != b[i]) {
         line += (mine.empty() ? "" : " ") + ("(stored: " + (i < b.size() ? b[i] : "none") + ")");
       }
-      out += (i ? "\n" : "") + line;
+      lines.push_back(line);
     }
-    return out;
+    return Join(lines, "\n");
   }
 
   std::map<std::string, Item> items_;

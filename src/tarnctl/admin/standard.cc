@@ -168,7 +168,7 @@ std::vector<ListRow> ListSystemSwitches(Store::Db& db) {
   for (const auto& sw : Store::Standard::List(db, Layer::kRunning, true)) {
     rows.push_back({sw.name, std::to_string(sw.row.numPorts),
                     std::to_string(Store::Standard::UsedPorts(db, sw.name)),
-                    Commas(Store::Standard::Uplinks(db, Layer::kRunning, sw.name))});
+                    Join(Store::Standard::Uplinks(db, Layer::kRunning, sw.name), ",")});
   }
   return rows;
 }

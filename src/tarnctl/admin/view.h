@@ -5,19 +5,21 @@
 #include <string>
 #include <vector>
 
+#include "hostctl/join.h"
 #include "tarnctl/admin/text_json.h"
 
 namespace TarnCtl::Admin {
 
+using HostCtl::Text::Join;
 using Store::Json;
 
 // A row of text fields per object (`tarnhost NOUN list`); an empty field is
 // none, and lists of pnics are joined by commas.
 using ListRow = std::vector<std::string>;
 
-// Names as a field of a list row holds them: joined by commas.
-std::string Commas(const std::vector<std::string>& names);
 // Items as people read them: joined by ", ", "(none)" for none.
-std::string Listed(const std::vector<std::string>& items);
+inline std::string Listed(const std::vector<std::string>& items) {
+  return items.empty() ? "(none)" : Join(items, ", ");
+}
 
 }  // namespace TarnCtl::Admin

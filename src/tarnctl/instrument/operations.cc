@@ -1,38 +1,12 @@
 #include "tarnctl/instrument/operations.h"
 
 #include <algorithm>
-#include <cctype>
 #include <vector>
 
+#include "hostctl/edit_distance.h"
+#include "hostctl/join.h"
+
 namespace TarnCtl::Instrument {
-
-namespace {
-
-// Edits (insertions, deletions, substitutions, case changes counted as
-// half) that turn `a` into `b`, times two.
-size_t Distance(std::string_view a, std::string_view b) {
-  std::vector<size_t> row(b.size() + 1);
-  for (size_t j = 0; j <= b.size(); ++j) row[j] = 2 * j;
-  for (size_t i = 1; i <= a.size(); ++i) {
-    size_t diagonal = row[0];
-    row[0] = 2 * i;
-    for (size_t j = 1; j <= b.size(); ++j) {
-      const size_t above = row[j];
-      size_t substitution = 0;
-      if (a[i - 1] != b[j - 1]) {
-        substitution = std::tolower(static_cast<unsigned char>(a[i - 1])) ==
-                               std::tolower(static_cast<unsigned char>(b[j - 1]))
-                           ? 1
-                           : 2;
-      }
-      row[j] = std::min({row[j] + 2, row[j - 1] + 2, diagonal + substitution});
-      diagonal = above;
-    }
-  }
-  return row[b.size()];
-}
-
-}  // namespace
 
 const Operation& Describe(Op op) {
   return kOperations[static_cast<size_t>(op)];
@@ -51,13 +25,13 @@ std::optional<std::string> NearestOperation(std::string_view name) {
   const Operation* best = nullptr;
   size_t bestDistance = 0;
   for (const Operation& operation : Operations()) {
-    const size_t distance = Distance(name, operation.name);
+    const size_t distance = HostCtl::Text::EditDistance(name, operation.name);
     if (best == nullptr || distance < bestDistance) {
       best = &operation;
       bestDistance = distance;
     }
   }
-  // Up to about a third of the name may be wrong.
+  // Up to about a third of the name may be wrong (the distance counts halves).
   if (best == nullptr || bestDistance > 2 * std::max<size_t>(2, name.size() / 3)) {
     return std::nullopt;
   }
@@ -79,12 +53,7 @@ std::string TargetText(unsigned targets) {
     if (targets & bit) words.push_back(word);
   }
   if (words.empty()) return "nothing (any call)";
-  std::string text;
-  for (size_t i = 0; i < words.size(); ++i) {
-    if (i > 0) text += i + 1 == words.size() ? " or " : ", ";
-    text += words[i];
-  }
-  return text;
+  return HostCtl::Text::Join(words, ", ", " or ");
 }
 
 }  // namespace TarnCtl::Instrument

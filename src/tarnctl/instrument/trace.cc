@@ -55,6 +55,17 @@ class BraceWriter {
   bool first_ = true;
 };
 
+// Items in brackets, each written as an argument is.
+template <typename Items>
+void AppendList(std::string& line, const Items& items) {
+  line += '[';
+  for (size_t i = 0; i < items.size(); ++i) {
+    if (i > 0) line += ", ";
+    AppendArg(line, items[i]);
+  }
+  line += ']';
+}
+
 // The trace file of this process.
 struct TraceFile {
   bool configured = false;
@@ -146,21 +157,11 @@ void AppendArg(std::string& line, const NODI_ParamList* list) {
     line += "null";
     return;
   }
-  line += '[';
-  for (size_t i = 0; i < list->values.size(); ++i) {
-    if (i > 0) line += ", ";
-    AppendArg(line, list->values[i]);
-  }
-  line += ']';
+  AppendList(line, list->values);
 }
 
 void AppendArg(std::string& line, const std::vector<std::string>& values) {
-  line += '[';
-  for (size_t i = 0; i < values.size(); ++i) {
-    if (i > 0) line += ", ";
-    AppendArg(line, values[i]);
-  }
-  line += ']';
+  AppendList(line, values);
 }
 
 void AppendArg(std::string& line, const HostCtl::Network::NicTeamingPolicy& policy) {

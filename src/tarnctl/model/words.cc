@@ -2,32 +2,18 @@
 
 #include <algorithm>
 
+#include "hostctl/join.h"
 #include "hostctl/uuid_text.h"
 #include "tarnctl/instrument/errors.h"
 
 namespace TarnCtl::Model {
-
-namespace {
-
-// "a, b or c" of `words`.
-template <size_t N>
-std::string Alternatives(const std::array<const char*, N>& words) {
-  std::string text;
-  for (size_t i = 0; i < N; ++i) {
-    if (i > 0) text += i + 1 == N ? " or " : ", ";
-    text += words[i];
-  }
-  return text;
-}
-
-}  // namespace
 
 int32_t CdpStatusOfWord(const std::string& word) {
   for (size_t i = 0; i < kCdpWords.size(); ++i) {
     if (word == kCdpWords[i]) return static_cast<int32_t>(i);
   }
   throw Instrument::Refused("Unknown CDP status " + word,
-                            "(expected " + Alternatives(kCdpWords) + ")");
+                            "(expected " + HostCtl::Text::Join(kCdpWords, ", ", " or ") + ")");
 }
 
 bool IsUuidText(const std::string& text) {
@@ -51,7 +37,7 @@ std::string UuidOfName(const std::string& name) {
 void CheckImplClass(const std::string& implClass) {
   if (std::find(kImplClasses.begin(), kImplClasses.end(), implClass) == kImplClasses.end()) {
     throw Instrument::Refused("Unknown implementation class " + implClass,
-                              "(" + Alternatives(kImplClasses) + ")");
+                              "(" + HostCtl::Text::Join(kImplClasses, ", ", " or ") + ")");
   }
 }
 

@@ -2,22 +2,23 @@
 
 #include <type_traits>
 
+#include "hostctl/join.h"
 #include "tarnctl/store/db.h"
 
 namespace TarnCtl::Store::Faults {
+
+using HostCtl::Text::Join;
 
 namespace {
 
 // The table's columns from the one description, as "a, b, c".
 std::string Columns(bool withId) {
   const Row none;
-  std::string columns;
+  std::vector<const char*> columns;
   VisitFields(none, [&](const Field& field, const auto&) {
-    if (!withId && field.value == Value::kId) return;
-    if (!columns.empty()) columns += ", ";
-    columns += field.column;
+    if (withId || field.value != Value::kId) columns.push_back(field.column);
   });
-  return columns;
+  return Join(columns, ", ");
 }
 
 }  // namespace
@@ -47,9 +48,9 @@ std::vector<Row> List(Db& db) {
 
 int64_t Insert(Db& db, const Row& row) {
   static const std::string sql = [] {
-    std::string places;
-    for (int i = 1; i < kFieldCount; ++i) places += i > 1 ? ", ?" : "?";
-    return "INSERT INTO fault(" + Columns(false) + ") VALUES (" + places + ") RETURNING id";
+    const std::vector<const char*> places(kFieldCount - 1, "?");  // all but the id
+    return "INSERT INTO fault(" + Columns(false) + ") VALUES (" + Join(places, ", ") +
+           ") RETURNING id";
   }();
   auto insert = db.Prepare(sql);
   int place = 0;

@@ -1,16 +1,13 @@
 #include "tarnctl/store/rows.h"
 
+#include "hostctl/join.h"
 #include "tarnctl/store/db.h"
 
 namespace TarnCtl::Store::Rows {
 
-namespace {
+using HostCtl::Text::Join;
 
-std::string ColumnList(const Shape& shape) {
-  std::string list;
-  for (const char* column : shape.columns) list += (list.empty() ? "" : ", ") + std::string(column);
-  return list;
-}
+namespace {
 
 int64_t Single(Db& db, const std::string& sql) {
   auto select = db.Prepare(sql);
@@ -19,10 +16,9 @@ int64_t Single(Db& db, const std::string& sql) {
 
 // A row whose key is there already is left out.
 std::string InsertSql(const Shape& shape) {
-  std::string marks;
-  for (size_t i = 1; i <= shape.columns.size(); ++i) marks += (i > 1 ? ", ?" : "?");
-  return "INSERT OR IGNORE INTO " + std::string(shape.table) + "(" + ColumnList(shape) +
-         ") VALUES (" + marks + ")";
+  const std::vector<const char*> marks(shape.columns.size(), "?");
+  return "INSERT OR IGNORE INTO " + std::string(shape.table) + "(" + Join(shape.columns, ", ") +
+         ") VALUES (" + Join(marks, ", ") + ")";
 }
 
 // Runs `sql` with `values`: whether a row went in.
@@ -45,8 +41,8 @@ bool InsertValues(Db& db, const std::string& sql, const std::vector<Value>& valu
 }  // namespace
 
 void Scan(Db& db, const Shape& shape, const std::function<void(const std::vector<Value>&)>& each) {
-  auto select = db.Prepare("SELECT " + ColumnList(shape) + " FROM " + shape.table + " ORDER BY " +
-                           shape.order);
+  auto select = db.Prepare("SELECT " + Join(shape.columns, ", ") + " FROM " + shape.table +
+                           " ORDER BY " + shape.order);
   std::vector<Value> values(shape.columns.size());
   while (select.Step()) {
     for (size_t i = 0; i < values.size(); ++i) {

@@ -24,11 +24,12 @@ TEST(OperationsTest, LookupsFindEveryOperation) {
   }
   EXPECT_EQ(FindOperation("SetVlanID"), nullptr);
   EXPECT_EQ(FindOperation("ZZZ"), nullptr);
+  // A swap of neighbours is one edit: eStVlanId is SetVlanId, not GetVlanId.
   const struct {
     const char* given;
     const char* nearest;
   } cases[] = {
-      {"SetVlanID", "SetVlanId"},      {"getmtu", "GetMTU"}, {"AddPortgroup", "AddPortGroup"},
+      {"eStVlanId", "SetVlanId"},      {"getmtu", "GetMTU"}, {"AddPortgroup", "AddPortGroup"},
       {"RemoveUplnk", "RemoveUplink"}, {"Frobnicate", ""},   {"", ""}};
   for (const auto& c : cases) {
     EXPECT_EQ(NearestOperation(c.given).value_or(""), c.nearest) << c.given;
