@@ -7,6 +7,7 @@
 #pragma once
 
 #include <cstdio>
+#include <cstring>
 #include <string>
 
 #define HOSTCTL_UUID_PATTERN                                 \
@@ -22,7 +23,7 @@ inline constexpr int kUuidBytes = 16;
 // zero.
 inline std::string UuidOfText(const char* text) {
   unsigned char b[kUuidBytes] = {};
-  std::snprintf(reinterpret_cast<char*>(b), sizeof b, "%s", text);
+  std::memcpy(b, text, strnlen(text, kUuidBytes - 1));
   char buffer[48];
   std::snprintf(buffer, sizeof buffer, HOSTCTL_UUID_PATTERN, b[0], b[1], b[2], b[3], b[4], b[5],
                 b[6], b[7], b[8], b[9], b[10], b[11], b[12], b[13], b[14], b[15]);

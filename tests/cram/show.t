@@ -77,3 +77,9 @@ offers exactly the names show takes.
   dvs0:101
   $ tarnhost fault add GetName --message $'bad\xff' && tarnhost show --json | jq -c '.faults'
   [{"number":1,"operation":"GetName","on":null,"message":{"hex":"626164ff"},"detail":"injected fault in GetName","skip":0,"times":1,"delayMs":0,"pass":false,"always":false,"fired":0,"state":"armed"}]
+
+A teaming order is a list, whatever its names hold:
+
+  $ tarnhost pnic add 'p:' && orvocfg-vswitch -a vsP && orvocfg-vswitch -L 'p:' vsP
+  $ tarnhost show vsP | grep -m1 Teaming
+      Teaming: flags 0x10, balancing 0, failback 0, order p:, max active 1

@@ -41,7 +41,7 @@ StandardSwitch Read(Store::Db& db, Layer layer, std::string name, Store::Standar
 // The fields of a teaming policy that people read, as "label value" pairs.
 class TeamingWriter {
  public:
-  std::string text = "Teaming:";
+  std::vector<std::string> fields;  // "label value"
 
   template <typename T>
   void Number(const char* key, const T& value) {
@@ -63,7 +63,7 @@ class TeamingWriter {
 
  private:
   void Add(const std::string& label, const std::string& value) {
-    text += (text.back() == ':' ? " " : ", ") + label + " " + value;
+    fields.push_back(label + " " + value);
   }
   bool ordered_ = false;
 };
@@ -72,7 +72,7 @@ std::string TeamingText(const std::string& stored) {
   TeamingWriter writer;
   const auto policy = Store::DecodeTeamingPolicy(stored);
   Store::VisitTeamingFields(policy, writer);
-  return writer.text;
+  return "Teaming: " + Join(writer.fields, ", ");
 }
 
 // Every field of the policy by name, and whether the uplink order is the
