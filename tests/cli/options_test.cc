@@ -142,7 +142,6 @@ TEST(ParseCommandLine, LeavesOperandsBehindTheOptions) {
       {{"vs0", "-a"}, 0x1, 2, {"vs0"}},
       {{"-a", "--", "-d"}, 0x1, 3, {"-d"}},
       {{"-ay", "vs1"}, 0x2000001, 2, {"vs1"}},
-      {{"--add", "vs1"}, 0x1, 2, {"vs1"}},
   };
   for (const auto& c : cases) {
     const Parsed parsed = Parse(c.args);

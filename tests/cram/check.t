@@ -36,11 +36,9 @@ reboot, before a restore) do not exist yet.
 
 Library failures are the run-wide handler's: nothing on standard output.
 
-  $ tarnhost fault add SwitchExists --detail 'switch table unreadable'
-  $ orvocfg-vswitch -c vswitch0
-  switch table unreadable
-  [1]
-  $ tarnhost fault add GetAllPortGroupNames --detail 'port group table unreadable'
-  $ orvocfg-vswitch -C Guests
-  port group table unreadable
-  [1]
+  $ for f in 'SwitchExists -c vswitch0' 'GetAllPortGroupNames -C Guests'; do set -- $f
+  >   tarnhost fault add $1 --detail "$1 failed in detail"; orvocfg-vswitch $2 $3; echo "status $?"; done
+  SwitchExists failed in detail
+  status 1
+  GetAllPortGroupNames failed in detail
+  status 1

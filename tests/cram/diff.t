@@ -22,22 +22,14 @@ layers it changed in, lists as values, objects in creation order; status 1.
   + portgroup Storage on vSwitch2 [running, stored]
   + fault 1 AddUplink
   [1]
-  $ tarnhost dump | tarnhost diff base.json - --json | jq -c '.[] | select(.kind == "portgroup")'
-  {"kind":"portgroup","name":"Test","layer":"running","field":"vlan","from":43,"to":100}
+  $ tarnhost dump | tarnhost diff base.json - --json | jq -c '.[] | select(.name == "Storage")'
   {"kind":"portgroup","name":"Storage","layer":"running","field":null,"from":null,"to":{"name":"Storage","switch":"vSwitch2","vlan":0,"clients":[],"teaming":{"flags":0,"balancing":0,"failback":0,"linkCriteria":{"checkMask":0,"minSpeed":0,"errorPercent":0,"fullDuplex":0},"uplinkOrderSet":false,"uplinkOrder":[],"maxActive":0}}}
-  {"kind":"portgroup","name":"Test","layer":"stored","field":"vlan","from":43,"to":100}
   {"kind":"portgroup","name":"Storage","layer":"stored","field":null,"from":null,"to":{"name":"Storage","switch":"vSwitch2","vlan":0,"clients":[],"teaming":{"flags":0,"balancing":0,"failback":0,"linkCriteria":{"checkMask":0,"minSpeed":0,"errorPercent":0,"fullDuplex":0},"uplinkOrderSet":false,"uplinkOrder":[],"maxActive":0}}}
 
---layers: from the running state to the stored configuration, what a reboot
-would lose and a restore bring back.
+--layers: from the running state to the stored configuration, equal here
+(what a reboot would lose: docs/testing.md).
 
   $ tarnhost diff --layers
-  $ orvocfg-vswitch -U pnic2 vSwitch1 && tarnhost reboot
-  $ orvocfg-vswitch -r
-  $ tarnhost diff --layers
-  vswitch vswitch0: uplinks (none) -> pnic0
-  vswitch vSwitch1: uplinks (none) -> pnic1
-  [1]
 
 Trouble is status 2.
 
@@ -75,10 +67,10 @@ touched.
   $ echo x > host.db.snapshots/bad && tarnhost snapshot restore bad 2>&1 | sed 's|^.*/bad|bad|'
   bad (file is not a database); the host was not changed
   $ tarnhost diff base && tarnhost snapshot del bad
-  $ tarnhost snapshot save a/b 2>&1; tarnhost snapshot save '' 2>&1 | head -1
+  $ tarnhost snapshot save a/b 2>&1
   tarnhost: snapshot name a/b contains '/' (a name is 1 to 64 bytes without '/' or a control character, not starting with '.')
   usage: tarnhost snapshot save NAME
-  tarnhost: snapshot name  is empty (a name is 1 to 64 bytes without '/' or a control character, not starting with '.')
+  [2]
   $ tarnhost snapshot del after && tarnhost snapshot list && ls host.db.snapshots
   base
   base

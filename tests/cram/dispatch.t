@@ -10,25 +10,25 @@ Usage errors (no option; ENS on and off at once) leave the host untouched.
   $ test -e trace || echo untouched
   untouched
 
-Missing arguments, each its own line and status 1.
-
-  $ for a in -a '-a -Z' '-v 10 vswitch0' '-M pnic1 vswitch0' '-P pnic1 dvs0' '-T dvs0'; do
-  >   orvocfg-vswitch $a 2>&1; echo "status $?"; done | paste -d' ' - - | uniq -c
-        2 No virtual switch name specified status 1
-        2 No portgroup name specified. Specify with -p option status 1
-        2 No DVPort ID specified. Specify with -V option status 1
-
-Names of 32 characters or more are refused, but for the DVPort uplink commands.
+Every command that needs a switch name ends the run without one, and with
+one of 32 characters or more but for the DVPort uplink commands, which look
+it up; a missing -p or -V has its own line. Status 1 each.
 
   $ long=abcdefghijklmnopqrstuvwxyz012345
-  $ for a in -a -c; do orvocfg-vswitch $a $long 2>&1; echo "status $?"; done | paste -d' ' - - | uniq -c
-        2 Virtual switch name too long (should be < 32) status 1
-  $ orvocfg-vswitch -a ${long%5}
-  $ orvocfg-vswitch -P pnic1 -V 1 $long
-  GetDVSwitchByName: DVS abcdefghijklmnopqrstuvwxyz012345 does not exist on this host
-  [1]
+  $ for a in -a -d '-L p' '-U p' '-A g' '-D g' -c '-v 1 -p g' '-B down' -b '-m 1' '-T -V 1' -x \
+  >     '-X 1' '-M u -p g' '-N u -p g' '-P u -V 1' '-Q u -V 1' -y -Y -z -f '-a -Z'; do
+  >   for name in '' $long; do orvocfg-vswitch $a $name 2>&1 | cut -d: -f1; echo "status ${PIPESTATUS[0]}"; done
+  > done | paste -d' ' - - | sort | uniq -c
+        2 GetDVSwitchByName status 1
+       23 No virtual switch name specified status 1
+       21 Virtual switch name too long (should be < 32) status 1
   $ grep -c "GetDVSwitchByName(\"$long\")" trace
-  1
+  2
+  $ for a in '-v 10' '-M pnic1' '-N pnic1' '-P pnic1' '-Q pnic1' -T; do
+  >   orvocfg-vswitch $a vswitch0 2>&1; echo "status $?"; done | paste -d' ' - - | uniq -c
+        3 No portgroup name specified. Specify with -p option status 1
+        3 No DVPort ID specified. Specify with -V option status 1
+  $ orvocfg-vswitch -a ${long%5}
 
 The port count follows the first ":" only with -a; elsewhere it is in the name.
 

@@ -21,12 +21,6 @@ No PID file: the message goes to standard output and nothing is reassociated.
   $ calls ReassociateEnsUplinks
   [1]
 
--z does not read the file.
-
-  $ orvocfg-vswitch -z vswitch0
-  $ calls ReassociateEnsUplinks
-  ReassociateEnsUplinks(false, false, 0, 0) on vswitch0
-
 A process of this test stands in for the device manager.
 
   $ sleep 120 & pid=$!

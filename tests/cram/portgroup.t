@@ -45,14 +45,12 @@ ALL on a switch without port groups is silent.
 
 Failures reading the port group list or names are fatal.
 
-  $ tarnhost fault add GetPortGroups --detail 'port groups unreadable'
-  $ orvocfg-vswitch -v 5 -p pg2 vswitch0
-  port groups unreadable
-  [1]
-  $ tarnhost fault add GetName --on pg1 --detail 'name unreadable'
-  $ orvocfg-vswitch -v 5 -p pg2 vswitch0
-  name unreadable
-  [1]
+  $ for f in GetPortGroups 'GetName --on pg1'; do
+  >   tarnhost fault add $f --detail "${f%% *} failed"; orvocfg-vswitch -v 5 -p pg2 vswitch0; echo "status $?"; done
+  GetPortGroups failed
+  status 1
+  GetName failed
+  status 1
   $ vlans
   Management 20
   pg1 16

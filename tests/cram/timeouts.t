@@ -43,11 +43,9 @@ LAG timeouts have an empty uplink column.
 
 A failure prints the detailed message alone and nothing of the listing.
 
-  $ tarnhost fault add GetLagTimeoutConfig --detail 'lag table unreadable'
-  $ orvocfg-vswitch -g; echo "status $?"
-  lag table unreadable
+  $ for f in 'GetLagTimeoutConfig -g' 'LoadUplinkTimeoutConfig -O'; do set -- $f
+  >   tarnhost fault add $1 --detail "$1 failed in detail"; orvocfg-vswitch $2; echo "status $?"; done
+  GetLagTimeoutConfig failed in detail
   status 1
-  $ tarnhost fault add LoadUplinkTimeoutConfig --detail 'uplink table locked'
-  $ orvocfg-vswitch -O; echo "status $?"
-  uplink table locked
+  LoadUplinkTimeoutConfig failed in detail
   status 1

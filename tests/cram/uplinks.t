@@ -90,6 +90,9 @@ The port group must exist on the host, then on the switch named.
   $ orvocfg-vswitch -N pnic1 -p Management sw1
   Portgroup (Management) does not exist on switch: sw1
   [1]
+  $ orvocfg-vswitch -N pnic1 -p pgA nosuch
+  Virtual switch nosuch does not exist
+  [1]
   $ tarnhost fault add GetUplinks --on sw1 --message 'uplinks unreadable'
   $ orvocfg-vswitch -M pnic1 -p pgA sw1
   uplinks unreadable

@@ -79,6 +79,7 @@ TEST(IsValidUuidString, FollowsScanRules) {
       {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee ffXYZ", true},
       {"  00\t11\n22 33 44 55 66 77-88 99 aa bb cc dd ee ff", true},
       {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee", false},
+      {"00 11 22 33 44 55 66 77 -88 99 aa bb cc dd ee ff", false},
       {"00:11:22:33:44:55:66:77-88:99:aa:bb:cc:dd:ee:ff", false},
       {"00 11 22 33 44 55 66 77-88 99 aa bb cc dd ee gg", false},
       {"", false},

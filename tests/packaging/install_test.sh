@@ -49,19 +49,14 @@ while IFS= read -r f; do
     fail "unexpected file installed: $f"
 done < <(cd "$root" && find . -type f | sed 's|^\./||')
 
-# The installed programs run, and work on a host of their own.
-usage=$("$root/${program[orvocfg-vswitch]}" -h)
-[ $? -eq 0 ] || fail "orvocfg-vswitch -h did not exit with 0"
-first=${usage%%$'\n'*}
-[ "$first" = "orvocfg-vswitch [options] [vswitch[:ports]]" ] ||
-    fail "orvocfg-vswitch -h printed '$first' first"
-if [ -x "$root/${program[tarnhost]}" ]; then
-    export TARN_HOST_DB=$tmp/host.db
-    unset TARN_TRACE
-    "$root/${program[tarnhost]}" init >/dev/null || fail "installed tarnhost init failed"
-    answer=$("$root/${program[orvocfg-vswitch]}" -c vswitch0)
-    [ "$answer" = 1 ] || fail "installed orvocfg-vswitch -c vswitch0 printed '$answer'"
-fi
+# The installed programs run, and work on a host of their own (what -h
+# prints: the usage transcript).
+export TARN_HOST_DB=$tmp/host.db
+unset TARN_TRACE
+[ ! -x "$root/${program[tarnhost]}" ] || "$root/${program[tarnhost]}" init >/dev/null ||
+    fail "installed tarnhost init failed"
+answer=$("$root/${program[orvocfg-vswitch]}" -c vswitch0 2>/dev/null)
+[ "$answer" = 1 ] || fail "installed orvocfg-vswitch -c vswitch0 printed '$answer'"
 
 # Compressed files: their source (the man pages with the version on the .TH
 # line, in place of the sources' placeholder), compressed with gzip -n so
@@ -140,9 +135,7 @@ done
 cases=(
     "orvocfg-vswitch -B li|listen|down"
     "orvocfg-vswitch --set-cdp=a|--set-cdp=advertise|advertise"
-    "orvocfg-vswitch -L pn||--add"
     "tarnhost dvs add dvs0 --ports = 8 --p|--portset|--ports --used"
-    "tarnhost load /et|/etc|"
 )
 for case in "${cases[@]}"; do
     IFS='|' read -r line want refuse <<<"$case"

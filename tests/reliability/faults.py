@@ -1,21 +1,19 @@
 #!/usr/bin/env python3
 """I/O faults at every file call of a command, injected with strace.
 
-Each command gets a host prepared for it. One run under strace counts the
-command's calls of each kind; then, for each occurrence N of a call, the
-command runs again on a fresh copy of the prepared host with that occurrence
-failing (EIO; ENOSPC too for writes) or with the process killed on it
-(writes and syncs). Opens, reads, stats and write() are counted and hit
-only on the host's files (the file, its log and journal, its directory, and
-the command's input file), so that neither the loader's files nor standard
-error are; pwrite64, syncs, truncates and locks, made on files only, are hit
-wherever they go (SQLite's temporary files too). After each run another
-program must open the host, sqlite3 must find it intact, and it must be
-exactly the host before or after the command; status 0 means after; a
-failure says what in one line, and nothing tells the user to move a good
-host away. A run is clean (before, status not 0), a success (after, 0),
-committed (after, not 0), lost (before, 0), corrupt (does not open, not
-intact, or neither host) or unclear (its message); the last three fail.
+One run under strace counts the command's calls of each kind; then, for
+each occurrence N of a call, the command runs on a fresh copy of its
+prepared host with that occurrence failing (EIO; ENOSPC too for writes) or
+the process killed on it (writes and syncs). Opens, reads, stats and write()
+are counted and hit only on the host's files (file, log, journal, directory
+and input file: not the loader's files nor standard error); pwrite64, syncs,
+truncates and locks wherever they go. After each run the host must open,
+pass sqlite3's integrity check, and be exactly the host before or after the
+command (after when the status is 0), a failure said in one line that never
+tells the user to move a good host away. A run is clean (before, status not
+0), a success (after, 0), committed (after, not 0), lost (before, 0),
+corrupt (does not open, not intact, or neither host) or unclear (its
+message); the last three fail.
 
 usage: faults.py BIN_DIR [--full] [--every K]
   default: every write and sync of -A, client add and snapshot restore,
@@ -109,19 +107,12 @@ class Fixture:
     def fresh(self, root, label):
         """A copy of the prepared host in a new directory: the path of its file."""
         run = tempfile.mkdtemp(prefix=label + ".", dir=root)
-        for f in os.listdir(self.prep):
-            if os.path.isdir(os.path.join(self.prep, f)):
-                shutil.copytree(os.path.join(self.prep, f), os.path.join(run, f))
-            else:
-                shutil.copy(os.path.join(self.prep, f), run)
+        shutil.copytree(self.prep, run, dirs_exist_ok=True)
         return os.path.join(run, "host.db")
 
     def state(self, db):
         """(dump, None) of the host at db, or (None, why it is corrupt)."""
-        if not os.path.exists(db) or os.path.getsize(db) == 0:
-            first = MISSING
-        else:
-            first = None
+        first = MISSING if not os.path.exists(db) or os.path.getsize(db) == 0 else None
         dump = self.host.run_as(db, self.host.tarnhost, "dump")
         if dump.returncode != 0:
             return None, f"does not open: {dump.stderr.strip()}"

@@ -64,15 +64,14 @@ class HostTest : public ScratchTest {
     return NetworkFactory::GetDVSwitchByName(name);
   }
   static void Reboot() { TarnCtl::Admin::Reboot(TarnCtl::Admin::Host().db()); }
+  static void Arm(const TarnCtl::Admin::FaultSeed& seed) {
+    TarnCtl::Admin::AddFault(TarnCtl::Admin::Host().db(), seed);
+  }
 
-  // The sample host: the default host (vswitch0 on pnic0, port group
-  // Management) plus
-  //  - vs1 (64 ports) on pnic1 with port groups pg1 (clients vm-a, vm-b)
-  //    and pg2;
-  //  - dvs0 (portset dvs0-ps, id dvs-dvs0) on pnic2 with DVPorts 100
-  //    (client vm-c, connection id 5) and 101;
-  //  - the opaque switch op0 (portset op0-ps) holding pnic3;
-  //  - pnic4, free.
+  // The default host (vswitch0 on pnic0, port group Management) plus vs1
+  // (64 ports) on pnic1 with pg1 (clients vm-a, vm-b) and pg2; dvs0 (portset
+  // dvs0-ps, id dvs-dvs0) on pnic2 with DVPorts 100 (client vm-c, connection
+  // id 5) and 101; the opaque switch op0 (portset op0-ps) on pnic3; pnic4.
   static void SeedSampleHost() {
     TarnCtl::Admin::Host host;
     TarnCtl::Store::Db& db = host.db();

@@ -10,10 +10,6 @@ using TarnCtl::Admin::FaultSeed;
 
 using FaultTest = HostTest;
 
-void Arm(FaultSeed seed) {
-  TarnCtl::Admin::AddFault(TarnCtl::Admin::Host().db(), seed);
-}
-
 FaultSeed Fault(const char* operation, std::optional<std::string> on = std::nullopt,
                 int64_t skip = 0, int64_t times = 1) {
   return {operation, std::move(on), "armed", "armed in detail", skip, times};

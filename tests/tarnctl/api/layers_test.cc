@@ -1,7 +1,6 @@
-// The two layers of the host: changes reach the stored configuration as
-// well as the running state (except where an operation says otherwise), a
-// reboot drops the running state, and the restore operations bring it back
-// (all of it, through the tool: the restore transcript).
+// Changes reach both layers unless an operation says otherwise, a reboot
+// drops the running state and the restores bring it back (all of it,
+// through the tool: the restore transcript).
 #include "host_fixture.h"
 
 namespace {

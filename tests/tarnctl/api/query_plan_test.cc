@@ -1,8 +1,6 @@
-// Every statement the library prepares in any test of this program reads
-// only what it needs: its query plan scans no table that grows with the
-// host, except in the steps that must read whole tables (listings, show,
-// dump, load, reboot, restore and diff).
-// Each test's process checks the statements it saw when it ends.
+// Every statement the library prepares in this program's tests scans no
+// table that grows with the host, but in the steps that must read whole
+// tables; checked when the process ends.
 #include <gtest/gtest.h>
 
 #include <map>

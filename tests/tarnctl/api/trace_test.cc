@@ -77,12 +77,9 @@ TEST_F(TraceTest, ObjectsOfEachKindNameThemselves) {
 TEST_F(TraceTest, JsonRecordsTellHowEachCallEnded) {
   StartTrace();
   setenv("TARN_TRACE_FORMAT", "json", 1);
-  auto arm = [](TarnCtl::Admin::FaultSeed seed) {
-    TarnCtl::Admin::AddFault(TarnCtl::Admin::Host().db(), seed);
-  };
-  arm({"SetVlanId", "Management", "bad\xff\x01", {}, 0, 1});
-  arm({"GetMTU", {}, {}, {}, 0, 1, 1, true});
-  arm({"NODI_CheckSig", {}, "nodi", {}, 0, 1});
+  Arm({"SetVlanId", "Management", "bad\xff\x01", {}, 0, 1});
+  Arm({"GetMTU", {}, {}, {}, 0, 1, 1, true});
+  Arm({"NODI_CheckSig", {}, "nodi", {}, 0, 1});
   {
     NetworkInfoImpl network;
     PortGroupImpl pg("Management");

@@ -35,10 +35,7 @@ TEST(OperationsTest, LookupsFindEveryOperation) {
     EXPECT_EQ(NearestOperation(c.given).value_or(""), c.nearest) << c.given;
   }
   EXPECT_EQ(FindOperation("SetTeamingPolicy")->targets, kStandardSwitch | kPortGroup);
-  EXPECT_FALSE(FindOperation("TARN_ReturnStatusToString")->faultable);
-  EXPECT_TRUE(FindOperation("NODI_Set")->faultable);
   EXPECT_EQ(TargetText(kStandardSwitch | kPortGroup), "a standard switch or a port group");
-  EXPECT_EQ(TargetText(kNoTarget), "nothing (any call)");
 }
 
 // The table's checks refuse what would break the lookups.

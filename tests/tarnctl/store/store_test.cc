@@ -127,11 +127,8 @@ TEST_F(StoreTest, FilesThatAreNotHostsAreLeftAlone) {
   EXPECT_EQ(Listing(), before);
 }
 
-// One lock per file: a symbolic link and a hard link reach the same lock,
-// and SQLite always opens the file by one name (so its journal is shared).
-// A run killed between its commit and the copy into the file leaves the
-// commit in the log: the next opening copies it in and empties the log, as
-// every commit does.
+// The next opening copies the commit in and empties the log, as every
+// commit does.
 TEST_F(StoreTest, AKilledRunsCommitIsCopiedInByTheNextOpening) {
   const std::string host = Path("host.db");
   Open(host);
@@ -159,6 +156,7 @@ TEST_F(StoreTest, AKilledRunsCommitIsCopiedInByTheNextOpening) {
   EXPECT_EQ(fs::file_size(host + "-wal"), 0u);  // not only when the connection closes
 }
 
+// SQLite always opens the file by one name, so its journal is shared too.
 TEST_F(StoreTest, EveryPathToTheFileSharesItsLock) {
   auto held = Open(Path("host.db"));
   fs::create_symlink(Path("host.db"), Path("alias.db"));
