@@ -76,11 +76,13 @@ void Session::ReplaceHost(const std::string& file) {
   Commit();
   // The copy commits by itself, outside the run.
   run_.reset();
-  struct Resume {
-    Session& session;
-    ~Resume() { session.run_.emplace(session.host_->db()); }
-  } resume{*this};
-  host_->db().ReplaceWith(file);
+  try {
+    host_->db().ReplaceWith(file);
+  } catch (...) {
+    run_.emplace(host_->db());
+    throw;
+  }
+  run_.emplace(host_->db());
 }
 
 Store::Location Session::DefaultLocation() {

@@ -143,8 +143,8 @@ class Db {
   // Makes the host the database file `file`, a copy that CopyTo made of a
   // host of this schema version, page by page in one commit of its own,
   // copied into the file as every commit is. Refuses another file and a
-  // damaged one, leaving the host as it was. Counts as a change of every
-  // row (ChangeCount() moves on).
+  // damaged one, leaving the host as it was. Counts as a change
+  // (ChangeCount() moves on), so that copies of rows are read again.
   // REQUIRES: no transaction is open (the copy commits by itself).
   void ReplaceWith(const std::string& file);
 
